@@ -1,0 +1,6 @@
+# Warnings that our own code compiles without. The presets turn them into errors.
+function(haze_preview_strict_warnings target)
+  target_compile_options(${target} PRIVATE
+    -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Wcast-qual -Wundef
+    -Wnon-virtual-dtor)
+endfunction()
