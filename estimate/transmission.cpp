@@ -1,0 +1,79 @@
+// Transmission map from the smoothed minimum channel: t = 1 - w * dark channel / A, with the mean of
+// the minimum channel, bounded by the minimum itself, in place of a minimum filter.
+#include "core/stripes.h"
+#include "estimate/transmission_kernels.h"
+#include "haze_preview.h"
+
+unsigned char* gCalTSrcPreview[haze::kSlots];
+unsigned char* gCalTSrc1Preview[haze::kSlots];
+unsigned char* gCalTDstPreview[haze::kSlots];
+int gAlpha[haze::kSlots];
+int gAA[haze::kSlots];
+int gCalTWPreview;
+int gCalTHPreview;
+
+namespace {
+
+using haze::estimate::HighLanes;
+
+constexpr int kThreads = 8;
+
+template <HighLanes kHighLanes>
+void transmission_map(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, int width,
+                      int height, float strength, float inv_a) {
+  if (width <= 0 || height <= 0) return;
+  const size_t count = static_cast<size_t>(width) * static_cast<size_t>(height);
+  const size_t grouped = count & ~(haze::estimate::kGroup - 1);
+  const haze::estimate::GroupArguments arguments = haze::estimate::group_arguments(strength, inv_a);
+  size_t done = 0;
+#if HAZE_NEON
+  done = haze::estimate::group_codes_neon<kHighLanes>(mean, minimum, codes, grouped, arguments);
+#endif
+  haze::estimate::group_codes_portable<kHighLanes>(mean, minimum, codes, done, grouped, arguments);
+  haze::estimate::tail_codes(mean, minimum, codes, grouped, count, strength, inv_a);
+}
+
+}  // namespace
+
+void CalculateTChannelPreviewNeonFloat(unsigned char* meanMap, unsigned char* minMap,
+                                       unsigned char* transmission, int width, int height,
+                                       float strength, float invA) {
+  transmission_map<HighLanes::kOwn>(meanMap, minMap, transmission, width, height, strength, invA);
+}
+
+void CalculateTChannelPreviewNeon(unsigned char* meanMap, unsigned char* minMap,
+                                  unsigned char* transmission, int width, int height,
+                                  float strength, float invA) {
+  transmission_map<HighLanes::kLow>(meanMap, minMap, transmission, width, height, strength, invA);
+}
+
+void* CalTThreadPreview(void* arg) {
+  const haze::StripeCode code = haze::decode_stripe(*static_cast<const int*>(arg));
+  const int width = gCalTWPreview;
+  const int height = gCalTHPreview;
+  if (!haze::is_stripe(code, kThreads) || width <= 0 || height <= 0) return nullptr;
+  const haze::StripeRange rows = haze::even_stripe(height, kThreads, code.stripe);
+  const uint8_t* mean = gCalTSrcPreview[code.slot];
+  const uint8_t* minimum = gCalTSrc1Preview[code.slot];
+  uint8_t* codes = gCalTDstPreview[code.slot];
+  const int strength_q8 = gAlpha[code.slot];
+  const int light = gAA[code.slot];
+  const ptrdiff_t end = static_cast<ptrdiff_t>(rows.end) * width;
+  for (ptrdiff_t i = static_cast<ptrdiff_t>(rows.begin) * width; i < end; ++i)
+    codes[i] = haze::estimate::code_q8(strength_q8, light, mean[i], minimum[i]);
+  return nullptr;
+}
+
+void CalculateTChannelPreview(unsigned char* meanMap, unsigned char* minMap,
+                              unsigned char* transmission, int width, int height, int strengthQ8,
+                              int atmosphericLight, int slot) {
+  if (!haze::is_slot(slot)) return;
+  gCalTSrcPreview[slot] = meanMap;
+  gCalTSrc1Preview[slot] = minMap;
+  gCalTDstPreview[slot] = transmission;
+  gAlpha[slot] = strengthQ8;
+  gAA[slot] = atmosphericLight;
+  gCalTWPreview = width;
+  gCalTHPreview = height;
+  haze::run_stripes<kThreads>(CalTThreadPreview, slot);
+}

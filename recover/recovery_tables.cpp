@@ -1,0 +1,19 @@
+#include "recover/recovery_tables.h"
+
+#include "haze_preview.h"
+#include "recover/recovery_kernels.h"
+
+namespace haze::recover {
+
+void build_tables(LightAnchor anchor, RecoveryTables& tables) {
+  for (int code = 0; code < kTableCodes; ++code) {
+    CodeTable& table = tables.codes[code];
+    const float factor = recovery_factor(code);
+    recover_all(anchor.y, factor, table.luma);
+    recover_all(anchor.v, factor, table.v);
+    recover_all(anchor.u, factor, table.u);
+    for (uint8_t& luma : table.luma) luma = LutTablePreview[luma];
+  }
+}
+
+}  // namespace haze::recover
