@@ -1,5 +1,5 @@
-// Bounds of bytes and integers. The library has no run-time dependency on the C++ library, and these
-// few lines keep <algorithm> out of every translation unit.
+// Bounds of bytes and integers. The library has no run-time dependency on the C++ library, and
+// these few lines keep <algorithm> out of every translation unit.
 #pragma once
 
 #include <stdint.h>

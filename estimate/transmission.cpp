@@ -1,5 +1,6 @@
-// Transmission map from the smoothed minimum channel: t = 1 - w * dark channel / A, with the mean of
-// the minimum channel, bounded by the minimum itself, in place of a minimum filter.
+// Transmission map from the smoothed minimum channel: t = 1 - w * dark channel / A, with the mean
+// of the minimum channel, bounded by the minimum itself, in place of a minimum filter.
+#include "core/image_size.h"
 #include "core/stripes.h"
 #include "estimate/transmission_kernels.h"
 #include "haze_preview.h"
@@ -21,8 +22,7 @@ constexpr int kThreads = 8;
 template <HighLanes kHighLanes>
 void transmission_map(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, int width,
                       int height, float strength, float inv_a) {
-  if (width <= 0 || height <= 0) return;
-  const size_t count = static_cast<size_t>(width) * static_cast<size_t>(height);
+  const size_t count = haze::pixel_count(width, height);
   const size_t grouped = count & ~(haze::estimate::kGroup - 1);
   const haze::estimate::GroupArguments arguments = haze::estimate::group_arguments(strength, inv_a);
   size_t done = 0;
@@ -48,18 +48,16 @@ void CalculateTChannelPreviewNeon(unsigned char* meanMap, unsigned char* minMap,
 }
 
 void* CalTThreadPreview(void* arg) {
-  const haze::StripeCode code = haze::decode_stripe(*static_cast<const int*>(arg));
-  const int width = gCalTWPreview;
-  const int height = gCalTHPreview;
-  if (!haze::is_stripe(code, kThreads) || width <= 0 || height <= 0) return nullptr;
-  const haze::StripeRange rows = haze::even_stripe(height, kThreads, code.stripe);
-  const uint8_t* mean = gCalTSrcPreview[code.slot];
-  const uint8_t* minimum = gCalTSrc1Preview[code.slot];
-  uint8_t* codes = gCalTDstPreview[code.slot];
+  const haze::StripeCode code = haze::decode_stripe(arg);
+  if (!haze::is_stripe(code, kThreads)) return nullptr;
+  const haze::PixelRange range(haze::even_stripe(gCalTHPreview, kThreads, code.stripe),
+                               gCalTWPreview);
+  const uint8_t* const mean = gCalTSrcPreview[code.slot] + range.begin;
+  const uint8_t* const minimum = gCalTSrc1Preview[code.slot] + range.begin;
+  uint8_t* const codes = gCalTDstPreview[code.slot] + range.begin;
   const int strength_q8 = gAlpha[code.slot];
   const int light = gAA[code.slot];
-  const ptrdiff_t end = static_cast<ptrdiff_t>(rows.end) * width;
-  for (ptrdiff_t i = static_cast<ptrdiff_t>(rows.begin) * width; i < end; ++i)
+  for (size_t i = 0; i < range.count; ++i)
     codes[i] = haze::estimate::code_q8(strength_q8, light, mean[i], minimum[i]);
   return nullptr;
 }

@@ -1,6 +1,7 @@
 // Mean filters of 8-bit images by running sums: each output costs the same for every window size.
 #include <stdint.h>
 
+#include "core/image_size.h"
 #include "filter/box_integer_kernels.h"
 #include "filter/reciprocals_64.h"
 #include "haze_preview.h"
@@ -53,8 +54,8 @@ uint8_t divide_small(uint32_t sum, uint32_t count) {
   return static_cast<uint8_t>(static_cast<float>(sum) / static_cast<float>(count));
 }
 
-// Double precision holds every sum and count of an image exactly, and its step under 256 is far less
-// than 1 / count. 32-bit ARM divides it in hardware, unlike 64-bit integers.
+// Double precision holds every sum and count of an image exactly, and its step under 256 is far
+// less than 1 / count. 32-bit ARM divides it in hardware, unlike 64-bit integers.
 uint8_t divide_large(double sum, double count) { return static_cast<uint8_t>(sum / count); }
 
 // Largest radius whose window sum, (2 * 127 + 1)^2 * 255, stays below 2^24.
@@ -70,8 +71,7 @@ void AverageFilterShort64_u8(unsigned char* src, unsigned char* dst, int width, 
 
 void AverageFilter_u8(unsigned char* src, unsigned char* dst, int width, int height, int radius,
                       int* scratch) {
-  // width >= 2 * radius + 1, said so that nothing can overflow.
-  if (radius < 1 || radius > (width - 1) / 2 || radius > (height - 1) / 2) return;
+  if (!haze::holds_window(width, height, radius)) return;
   if (radius <= kLargestSmallRadius)
     average_square<uint32_t>(src, dst, width, height, radius, scratch, divide_small);
   else

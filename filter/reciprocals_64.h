@@ -1,4 +1,5 @@
-// Division by the pixel counts of a 64 x 64 window that the image border cuts, as one multiplication.
+// Division by the pixel counts of a 64 x 64 window that the image border cuts, as one
+// multiplication.
 #pragma once
 
 #include <stdint.h>

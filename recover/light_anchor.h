@@ -15,8 +15,8 @@ struct LightAnchor {
   }
 };
 
-// BT.601: Y = 0.587 G + 0.114 B + 0.299 R, U = 128 + 0.564 (B - Y), V = 128 + 0.713 (R - Y), in double
-// precision, each truncated to a byte.
+// BT.601: Y = 0.587 G + 0.114 B + 0.299 R, U = 128 + 0.564 (B - Y), V = 128 + 0.713 (R - Y), in
+// double precision, each truncated to a byte.
 //
 // The order of the sum is part of the result: for some grey lights its rounding falls just short of
 // the integer, and Y is one less than the light. Range: Y is at most 255, U and V lie in 0 ... 255,

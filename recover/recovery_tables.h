@@ -20,10 +20,12 @@ struct RecoveryTables {
   CodeTable codes[kTableCodes];
 };
 
+void build_code_table(LightAnchor anchor, int code, CodeTable& table);
+
 void build_tables(LightAnchor anchor, RecoveryTables& tables);
 
-// Tables that are kept as long as the light stays the same, as it does between an estimate frame and
-// the reuse frame after it.
+// Tables that are kept as long as the light stays the same, as it does between an estimate frame
+// and the reuse frame after it.
 class KeptTables {
  public:
   const RecoveryTables& for_anchor(LightAnchor anchor) {

@@ -18,8 +18,8 @@ bool is_accepted(const StreamState& stream, int width, int height) {
 // column.
 //
 // Each row is read from where the scan of the row before ended. That position is two rows further
-// down for an even width and one byte more for an odd one, so the scan drifts to the right, and over
-// the end of its map into the region behind it by less than half_height / 2 bytes.
+// down for an even width and one byte more for an odd one, so the scan drifts to the right, and
+// over the end of its map into the region behind it by less than half_height / 2 bytes.
 uint8_t scan_light(const WorkingMemory& memory) {
   const ptrdiff_t row_step = 2 * ((memory.half_width + 1) / 2) + memory.half_width;
   uint8_t most_of_max = 0;

@@ -46,8 +46,8 @@ void InitHazePreviewFormat(INPUT_FORMAT format, int width, int height) {
   gHazePreviewMemory = static_cast<unsigned char*>(malloc(bytes));
   if (gHazePreviewMemory == nullptr) return;
   // With an odd half size the scan for the light may read scratch bytes that no stage writes. They
-  // are zero, so that results do not depend on what the heap held. No frame reaches further than the
-  // largest one does.
+  // are zero, so that results do not depend on what the heap held. No frame reaches further than
+  // the largest one does.
   memset(gHazePreviewMemory, 0, haze::min(bytes, WorkingMemory::bytes(kMostWidth, kMostHeight)));
   own_block = {gHazePreviewMemory, bytes};
 }

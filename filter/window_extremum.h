@@ -1,0 +1,170 @@
+// Minimum and maximum filters over sliding windows of any length.
+//
+// A window of 2^k samples is the extremum of two windows of half its length, and a window of any
+// length that of two overlapping ones of the largest power of two below it:
+//
+//   length 1   a b c d e f g
+//   length 2   ab bc cd de ..        each step combines a row with itself, shifted
+//   length 4   abcd bcde ..
+//   length 7   abcd + defg
+//
+// so the filter costs log2(window) passes whose inner loop runs over contiguous memory, for lines
+// along a row as well as for bundles of columns.
+#pragma once
+
+#include <stddef.h>
+#include <stdint.h>
+#include <string.h>
+
+#include "core/numeric.h"
+#include "core/scratch.h"
+#include "core/target.h"
+
+namespace haze::filter {
+
+// Neutral is what samples beyond the image count as. Of equal samples the later one is taken, which
+// matters for zeros of different sign.
+struct LeastByte {
+  using Value = uint8_t;
+  static constexpr Value kNeutral = 255;
+  static Value combine(Value earlier, Value later) { return later <= earlier ? later : earlier; }
+#if HAZE_NEON
+  static constexpr size_t kLanes = 16;
+  static void combine_lanes(const Value* earlier, const Value* later, Value* to) {
+    vst1q_u8(to, vminq_u8(vld1q_u8(earlier), vld1q_u8(later)));
+  }
+#endif
+};
+
+struct MostFloat {
+  using Value = float;
+  static constexpr Value kNeutral = -__builtin_inff();
+  static Value combine(Value earlier, Value later) { return later >= earlier ? later : earlier; }
+#if HAZE_NEON
+  static constexpr size_t kLanes = 4;
+  static void combine_lanes(const Value* earlier, const Value* later, Value* to) {
+    const float32x4_t a = vld1q_f32(earlier);
+    const float32x4_t b = vld1q_f32(later);
+    vst1q_f32(to, vbslq_f32(vcgeq_f32(b, a), b, a));
+  }
+#endif
+};
+
+// to[i] = combine(earlier[i], later[i]). The ranges do not overlap `to`.
+template <typename Extremum>
+inline void combine_lines(const typename Extremum::Value* earlier,
+                          const typename Extremum::Value* later,
+                          typename Extremum::Value* __restrict to, size_t count) {
+  size_t i = 0;
+#if HAZE_NEON
+  for (; i + Extremum::kLanes <= count; i += Extremum::kLanes)
+    Extremum::combine_lanes(earlier + i, later + i, to + i);
+#endif
+  for (; i < count; ++i) to[i] = Extremum::combine(earlier[i], later[i]);
+}
+
+// Two buffers that hold a bundle of lines, with room for `radius` samples beyond both ends.
+template <typename Extremum>
+class WindowLines {
+ public:
+  using Value = typename Extremum::Value;
+
+  // For lines of `samples` samples, `bundle` of them side by side. A radius beyond the line is cut
+  // to its length, where the window already covers all of it.
+  WindowLines(int samples, int radius, int bundle)
+      : samples_(static_cast<size_t>(samples)),
+        radius_(static_cast<size_t>(min(radius, samples))),
+        bundle_(static_cast<size_t>(bundle)),
+        buffers_(2 * padded()) {}
+
+  explicit operator bool() const { return static_cast<bool>(buffers_); }
+
+  // From now on this many lines side by side, at most as many as at first.
+  void narrow_to(int bundle) { bundle_ = static_cast<size_t>(bundle); }
+
+  // Where sample i of the lines goes, for `bundle` values. To be filled before each filter().
+  Value* sample(int i) { return buffers_.data() + (radius_ + static_cast<size_t>(i)) * bundle_; }
+
+  // Extrema of the windows i - radius ... i + radius of all lines, sample by sample like the input.
+  const Value* filter() {
+    Value* from = buffers_.data();
+    Value* to = from + padded();
+    const size_t border = radius_ * bundle_;
+    for (size_t i = 0; i < border; ++i) {
+      from[i] = Extremum::kNeutral;
+      from[padded() - 1 - i] = Extremum::kNeutral;
+    }
+    const size_t window = 2 * radius_ + 1;
+    size_t have = 1;
+    size_t left = padded();  // values for which windows of length `have` are known
+    while (2 * have <= window) {
+      left -= have * bundle_;
+      combine_lines<Extremum>(from, from + have * bundle_, to, left);
+      Value* const filled = to;
+      to = from;
+      from = filled;
+      have *= 2;
+    }
+    if (have == window) return from;
+    combine_lines<Extremum>(from, from + (window - have) * bundle_, to, samples_ * bundle_);
+    return to;
+  }
+
+ private:
+  size_t padded() const { return (samples_ + 2 * radius_) * bundle_; }
+
+  size_t samples_;
+  size_t radius_;
+  size_t bundle_;
+  Scratch<Value> buffers_;
+};
+
+// One line of `samples` contiguous samples; outputs lie `dst_stride` apart. If memory is short, or
+// the radius negative, nothing is written.
+template <typename Extremum>
+inline bool filter_line(const typename Extremum::Value* src, typename Extremum::Value* dst,
+                        int samples, ptrdiff_t dst_stride, int radius) {
+  if (samples < 1 || radius < 0) return false;
+  WindowLines<Extremum> line(samples, radius, 1);
+  if (!line) return false;
+  memcpy(line.sample(0), src, static_cast<size_t>(samples) * sizeof *src);
+  const typename Extremum::Value* const extrema = line.filter();
+  for (int i = 0; i < samples; ++i) dst[i * dst_stride] = extrema[i];
+  return true;
+}
+
+// All rows of an image whose rows lie `stride` samples apart.
+template <typename Extremum>
+inline bool filter_rows(const typename Extremum::Value* src, typename Extremum::Value* dst,
+                        int width, int height, ptrdiff_t stride, int radius) {
+  if (width < 1 || height < 1 || radius < 0) return false;
+  WindowLines<Extremum> line(width, radius, 1);
+  if (!line) return false;
+  const size_t bytes = static_cast<size_t>(width) * sizeof *src;
+  for (int y = 0; y < height; ++y) {
+    memcpy(line.sample(0), src + y * stride, bytes);
+    memcpy(dst + y * stride, line.filter(), bytes);
+  }
+  return true;
+}
+
+// All columns, in bundles that fill a cache line.
+template <typename Extremum>
+inline bool filter_columns(const typename Extremum::Value* src, typename Extremum::Value* dst,
+                           int width, int height, ptrdiff_t stride, int radius) {
+  constexpr int kBundle = 64 / sizeof(typename Extremum::Value);
+  if (width < 1 || height < 1 || radius < 0) return false;
+  WindowLines<Extremum> columns(height, radius, min(kBundle, width));
+  if (!columns) return false;
+  for (int x = 0; x < width; x += kBundle) {
+    const int bundle = min(kBundle, width - x);
+    columns.narrow_to(bundle);
+    const size_t bytes = static_cast<size_t>(bundle) * sizeof *src;
+    for (int y = 0; y < height; ++y) memcpy(columns.sample(y), src + y * stride + x, bytes);
+    const typename Extremum::Value* const extrema = columns.filter();
+    for (int y = 0; y < height; ++y) memcpy(dst + y * stride + x, extrema + y * bundle, bytes);
+  }
+  return true;
+}
+
+}  // namespace haze::filter

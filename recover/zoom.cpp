@@ -1,0 +1,86 @@
+// Half-resolution BGR of preview frames by eight threads, and float planes at twice their size.
+#include "core/scratch.h"
+#include "core/stripes.h"
+#include "haze_preview.h"
+
+unsigned char* gZoomOutSrcPreview[haze::kSlots];
+unsigned char* gZoomOutDstPreview[haze::kSlots];
+int gZoomOutWPreview;
+int gZoomOutHPreview;
+
+namespace {
+
+constexpr int kThreads = 8;
+
+// Stripe 3, not the last one, takes what the even split leaves over: it ends among the rows of
+// stripe 4, and the last rows of the frame are converted by none.
+haze::StripeRange zoom_stripe(int height, int stripe) {
+  const int rows = haze::even_stripe(height, kThreads, 0).end;
+  const int begin = stripe * rows;
+  return {begin, stripe == 3 ? height - 4 * rows : begin + rows};
+}
+
+// Two samples for each: the sample itself and the mean of it and the next one. The last is
+// repeated.
+void zoom_row(const float* src, float* dst, int width) {
+  for (int x = 0; x < width - 1; ++x) {
+    dst[2 * x] = src[x];
+    dst[2 * x + 1] = (src[x] + src[x + 1]) * 0.5f;
+  }
+  dst[2 * width - 2] = src[width - 1];
+  dst[2 * width - 1] = src[width - 1];
+}
+
+}  // namespace
+
+void* ZoomOutThreadPreview(void* arg) {
+  const haze::StripeCode code = haze::decode_stripe(arg);
+  if (!haze::is_stripe(code, kThreads)) return nullptr;
+  const ptrdiff_t width = gZoomOutWPreview;
+  const ptrdiff_t height = gZoomOutHPreview;
+  if (width < 1 || height < 1) return nullptr;
+  const haze::StripeRange rows = zoom_stripe(gZoomOutHPreview, code.stripe);
+  unsigned char* const frame = gZoomOutSrcPreview[code.slot];
+  unsigned char* const luma = frame + width * rows.begin;
+  unsigned char* const bgr = gZoomOutDstPreview[code.slot] + width * rows.begin / 4 * 3;
+  if (gPerviewFormat == kInputFormatPlanar) {
+    xYCrCb2BGRPreview(luma, frame + width * height + width / 2 * (rows.begin / 2), bgr,
+                      gZoomOutWPreview, rows.end - rows.begin);
+  } else {
+    xYCrCb2BGRPreview_NV21(luma, frame + width * height + width * (rows.begin / 2), bgr,
+                           gZoomOutWPreview, rows.end - rows.begin);
+  }
+  return nullptr;
+}
+
+void ZoomOutImgPreview(unsigned char* src, unsigned char* dst, int width, int height, int slot) {
+  if (!haze::is_slot(slot)) return;
+  gZoomOutSrcPreview[slot] = src;
+  gZoomOutDstPreview[slot] = dst;
+  gZoomOutWPreview = width;
+  gZoomOutHPreview = height;
+  haze::run_stripes<kThreads>(ZoomOutThreadPreview, slot);
+}
+
+void ZoomIn_Linear_fPreview(const float* src, float* dst, int width, int height) {
+  if (width < 1 || height < 1) return;
+  const size_t columns = 2 * static_cast<size_t>(width);
+  haze::Scratch<float> rows(2 * columns);
+  if (!rows) return;
+  float* current = rows.data();
+  float* next = current + columns;
+  zoom_row(src, current, width);
+  for (int y = 0; y < height; ++y) {
+    float* const even = dst + 2 * static_cast<size_t>(y) * columns;
+    float* const odd = even + columns;
+    const bool last = y + 1 == height;
+    if (!last) zoom_row(src + static_cast<size_t>(y + 1) * static_cast<size_t>(width), next, width);
+    for (size_t x = 0; x < columns; ++x) {
+      even[x] = current[x];
+      odd[x] = last ? current[x] : (current[x] + next[x]) * 0.5f;
+    }
+    float* const used = current;
+    current = next;
+    next = used;
+  }
+}
