@@ -24,7 +24,7 @@ float slope_of(float covariance, float variance) {
 uint8_t code_of(float value) {
   if (static_cast<double>(value) > 0.99) return 158;
   const float code = 200.0f * value - 40.0f;
-  return code > 0.0f ? static_cast<uint8_t>(code) : 0;
+  return static_cast<uint8_t>(code > 0.0f ? code : 0.0f);
 }
 
 }  // namespace

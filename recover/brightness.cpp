@@ -14,7 +14,7 @@ namespace {
 uint8_t lifted(int value) {
   const double gain = log(value + 1.0) / log(2.0 + value / 230.0 * 8.0) * 0.42308129542259015;
   const double result = value * gain;
-  return result > 255.0 ? 255 : result < 0.0 ? 0 : static_cast<uint8_t>(result);
+  return static_cast<uint8_t>(result > 255.0 ? 255.0 : result < 0.0 ? 0.0 : result);
 }
 
 }  // namespace

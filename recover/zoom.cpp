@@ -38,7 +38,8 @@ void* ZoomOutThreadPreview(void* arg) {
   if (!haze::is_stripe(code, kThreads)) return nullptr;
   const ptrdiff_t width = gZoomOutWPreview;
   const ptrdiff_t height = gZoomOutHPreview;
-  if (width < 1 || height < 1) return nullptr;
+  // Odd sides would end in blocks whose chroma the frame does not have.
+  if (width < 1 || height < 1 || width % 2 != 0 || height % 2 != 0) return nullptr;
   const haze::StripeRange rows = zoom_stripe(gZoomOutHPreview, code.stripe);
   unsigned char* const frame = gZoomOutSrcPreview[code.slot];
   unsigned char* const luma = frame + width * rows.begin;

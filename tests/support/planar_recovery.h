@@ -1,0 +1,41 @@
+// The three recoveries of planar frames by reciprocals, each beside its definition.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <vector>
+
+#include "tests/support/recovery_inputs.h"
+
+namespace haze::test {
+
+struct PlanarMember {
+  const char* name;
+  void (*recover)(unsigned char*, float*, unsigned char*, int, int, int);
+  void (*reference)(uint8_t*, const float*, const uint8_t*, int, int);
+};
+
+extern const PlanarMember kAnchors;  // HazeRemovingPreview
+extern const PlanarMember kInteger;  // HazeRemoving1Preview
+extern const PlanarMember kSingle;   // HazeRemoving2Preview
+
+// Frame, map and light in buffers of their exact sizes, against the reference.
+void compare(const PlanarMember& member, const std::vector<uint8_t>& frame,
+             const std::vector<float>& map, const Light& light, int width, int height,
+             int ignored = 0);
+
+// The recovered frame.
+std::vector<uint8_t> run(const PlanarMember& member, std::vector<uint8_t> frame,
+                         std::vector<float> map, Light light, int width, int height);
+
+// A square frame that holds every byte value four times in luma, and once in each chroma plane in
+// opposite orders, with a map of one value.
+struct AllValues {
+  static constexpr int kSide = 32;
+  static constexpr size_t kLumaBytes = kSide * kSide;
+
+  static std::vector<uint8_t> frame();
+  static std::vector<float> map(float t);
+};
+
+}  // namespace haze::test
