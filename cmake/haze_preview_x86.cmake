@@ -3,10 +3,13 @@
 # whole library.
 if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(x86_64|AMD64)$" AND NOT HAZE_PREVIEW_PORTABLE)
   set(x86_kernels
+    color/channel_maps
+    color/convert
     color/max_min_nv21
     estimate/transmission
     filter/box_integer
-    recover/frame_recovery)
+    recover/frame_recovery
+    recover/reciprocal)
   set(avx2_flags -mavx2)
   set(avx512_flags -mavx512f -mavx512bw -mavx512dq -mavx512vl -mavx512vbmi)
   if(CMAKE_CXX_COMPILER_ID STREQUAL GNU)

@@ -31,6 +31,7 @@ struct Avx2 {
 
   static Int bit_and(Int a, Int b) { return _mm256_and_si256(a, b); }
   static Int bit_xor(Int a, Int b) { return _mm256_xor_si256(a, b); }
+  static Int bit_or(Int a, Int b) { return _mm256_or_si256(a, b); }
   static Int add16(Int a, Int b) { return _mm256_add_epi16(a, b); }
   static Int add32(Int a, Int b) { return _mm256_add_epi32(a, b); }
   static Int min16(Int a, Int b) { return _mm256_min_epi16(a, b); }
@@ -91,11 +92,53 @@ struct Avx2 {
     _mm_storel_epi64(reinterpret_cast<__m128i*>(to), _mm256_castsi256_si128(bytes));
   }
 
+  static Int min8u(Int a, Int b) { return _mm256_min_epu8(a, b); }
+  static Int interleave_low8(Int a, Int b) { return _mm256_unpacklo_epi8(a, b); }
+  static Int interleave_high8(Int a, Int b) { return _mm256_unpackhi_epi8(a, b); }
+  static Int interleave_low16(Int a, Int b) { return _mm256_unpacklo_epi16(a, b); }
+  static Int interleave_high16(Int a, Int b) { return _mm256_unpackhi_epi16(a, b); }
+  static Int clamp16_by_lanes(Int low, Int high) { return _mm256_packus_epi16(low, high); }
+
+  // Each 128-bit lane holds sixteen pixels in three chunks of sixteen bytes. At offset o of chunk c
+  // stands channel (c + o) % 3, so a channel is picked from the chunks by offset alone and then put
+  // in order within the lane.
+  static void load_three(const uint8_t* from, Int (&channels)[3]) {
+    const Int chunks[3] = {load_lanes(from, from + 48), load_lanes(from + 16, from + 64),
+                           load_lanes(from + 32, from + 80)};
+    for (int channel = 0; channel < 3; ++channel)
+      channels[channel] = _mm256_shuffle_epi8(
+          pick(chunks[channel], chunks[(channel + 2) % 3], chunks[(channel + 1) % 3]),
+          repeat_lane(kSplitOrder[channel].bytes));
+  }
+  static void store_three(uint8_t* to, Int a, Int b, Int c) {
+    const Int x = _mm256_shuffle_epi8(a, repeat_lane(kJoinOrder[0].bytes));
+    const Int y = _mm256_shuffle_epi8(b, repeat_lane(kJoinOrder[1].bytes));
+    const Int z = _mm256_shuffle_epi8(c, repeat_lane(kJoinOrder[2].bytes));
+    const Int chunks[3] = {pick(x, y, z), pick(y, z, x), pick(z, x, y)};
+    for (int chunk = 0; chunk < 3; ++chunk)
+      store_halves(to + 16 * chunk, to + 48 + 16 * chunk, chunks[chunk]);
+  }
+
   static Float set_float(float a) { return _mm256_set1_ps(a); }
   static Float set_alternating(float a, float b) { return _mm256_setr_ps(a, b, a, b, a, b, a, b); }
   static Float load_bytes(const uint8_t* from) {
     return _mm256_cvtepi32_ps(
         _mm256_cvtepu8_epi32(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(from))));
+  }
+  static Float load_floats(const float* from) { return _mm256_loadu_ps(from); }
+  static Float interleave_low(Float a, Float b) {
+    return _mm256_permute2f128_ps(_mm256_unpacklo_ps(a, b), _mm256_unpackhi_ps(a, b), 0x20);
+  }
+  static Float interleave_high(Float a, Float b) {
+    return _mm256_permute2f128_ps(_mm256_unpacklo_ps(a, b), _mm256_unpackhi_ps(a, b), 0x31);
+  }
+  static Float spread_quarter(Float a, Float b, int quarter) {
+    const Int order = add32(_mm256_setr_epi32(0, 0, 0, 0, 1, 1, 1, 1), set32(2 * quarter));
+    return _mm256_blend_ps(_mm256_permutevar8x32_ps(a, order), _mm256_permutevar8x32_ps(b, order),
+                           0x44);
+  }
+  static Float set_four(float a, float b, float c, float d) {
+    return _mm256_setr_ps(a, b, c, d, a, b, c, d);
   }
   static Float add(Float a, Float b) { return _mm256_add_ps(a, b); }
   static Float sub(Float a, Float b) { return _mm256_sub_ps(a, b); }
@@ -131,6 +174,45 @@ struct Avx2 {
 
     const uint8_t* bytes;
   };
+
+ private:
+  struct LaneOrder {
+    uint8_t bytes[16];
+  };
+
+  // Byte i of a channel stands at offset (3 i + channel) % 16 of its chunk.
+  static constexpr LaneOrder split_order(int channel) {
+    LaneOrder order = {};
+    for (int i = 0; i < 16; ++i) order.bytes[i] = static_cast<uint8_t>((3 * i + channel) % 16);
+    return order;
+  }
+  static constexpr LaneOrder join_order(int channel) {
+    LaneOrder order = {};
+    for (int i = 0; i < 16; ++i) order.bytes[(3 * i + channel) % 16] = static_cast<uint8_t>(i);
+    return order;
+  }
+  static const LaneOrder kSplitOrder[3];
+  static const LaneOrder kJoinOrder[3];
+
+  static Int load_lanes(const uint8_t* low, const uint8_t* high) {
+    return _mm256_inserti128_si256(
+        _mm256_castsi128_si256(_mm_loadu_si128(reinterpret_cast<const __m128i*>(low))),
+        _mm_loadu_si128(reinterpret_cast<const __m128i*>(high)), 1);
+  }
+  static Int repeat_lane(const uint8_t* bytes) { return load_lanes(bytes, bytes); }
+  // Bytes of a, b and c at the offsets 0, 1 and 2 modulo 3 of each lane.
+  static Int pick(Int a, Int b, Int c) {
+    const Int second = _mm256_setr_epi8(0, -1, 0, 0, -1, 0, 0, -1, 0, 0, -1, 0, 0, -1, 0, 0, 0, -1,
+                                        0, 0, -1, 0, 0, -1, 0, 0, -1, 0, 0, -1, 0, 0);
+    const Int third = _mm256_setr_epi8(0, 0, -1, 0, 0, -1, 0, 0, -1, 0, 0, -1, 0, 0, -1, 0, 0, 0,
+                                       -1, 0, 0, -1, 0, 0, -1, 0, 0, -1, 0, 0, -1, 0);
+    return _mm256_blendv_epi8(_mm256_blendv_epi8(a, b, second), c, third);
+  }
 };
+
+inline constexpr Avx2::LaneOrder Avx2::kSplitOrder[3] = {split_order(0), split_order(1),
+                                                         split_order(2)};
+inline constexpr Avx2::LaneOrder Avx2::kJoinOrder[3] = {join_order(0), join_order(1),
+                                                        join_order(2)};
 
 }  // namespace haze

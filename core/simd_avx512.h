@@ -30,6 +30,7 @@ struct Avx512 {
 
   static Int bit_and(Int a, Int b) { return _mm512_and_si512(a, b); }
   static Int bit_xor(Int a, Int b) { return _mm512_xor_si512(a, b); }
+  static Int bit_or(Int a, Int b) { return _mm512_or_si512(a, b); }
   static Int add16(Int a, Int b) { return _mm512_add_epi16(a, b); }
   static Int add32(Int a, Int b) { return _mm512_add_epi32(a, b); }
   static Int min16(Int a, Int b) { return _mm512_min_epi16(a, b); }
@@ -96,6 +97,35 @@ struct Avx512 {
     _mm_storeu_si128(reinterpret_cast<__m128i*>(to), _mm512_cvtepi32_epi8(a));
   }
 
+  static Int min8u(Int a, Int b) { return _mm512_min_epu8(a, b); }
+  // Bytes of a and b in turn, a first, by 128-bit lanes; as 16-bit values with b = 0.
+  static Int interleave_low8(Int a, Int b) { return _mm512_unpacklo_epi8(a, b); }
+  static Int interleave_high8(Int a, Int b) { return _mm512_unpackhi_epi8(a, b); }
+  static Int interleave_low16(Int a, Int b) { return _mm512_unpacklo_epi16(a, b); }
+  static Int interleave_high16(Int a, Int b) { return _mm512_unpackhi_epi16(a, b); }
+  // 16-bit values as bytes clamped to 0 ... 255, by 128-bit lanes.
+  static Int clamp16_by_lanes(Int low, Int high) { return _mm512_packus_epi16(low, high); }
+
+  // kBytes pixels of three bytes as three vectors, and back.
+  static void load_three(const uint8_t* from, Int (&channels)[3]) {
+    const Int a = load(from);
+    const Int b = load(from + 64);
+    const Int c = load(from + 128);
+    for (int channel = 0; channel < 3; ++channel) {
+      const ByteOrder& order = kSplitOrder[channel];
+      channels[channel] = _mm512_permutex2var_epi8(
+          _mm512_permutex2var_epi8(a, load(order.first), b), load(order.second), c);
+    }
+  }
+  static void store_three(uint8_t* to, Int a, Int b, Int c) {
+    for (int part = 0; part < 3; ++part) {
+      const ByteOrder& order = kJoinOrder[part];
+      store(to + 64 * part,
+            _mm512_permutex2var_epi8(_mm512_permutex2var_epi8(a, load(order.first), b),
+                                     load(order.second), c));
+    }
+  }
+
   static Float set_float(float a) { return _mm512_set1_ps(a); }
   // a in even lanes, b in odd ones.
   static Float set_alternating(float a, float b) {
@@ -107,6 +137,23 @@ struct Avx512 {
     return _mm512_cvtepi32_ps(
         _mm512_cvtepu8_epi32(_mm_loadu_si128(reinterpret_cast<const __m128i*>(from))));
   }
+  static Float load_floats(const float* from) { return _mm512_loadu_ps(from); }
+  // Lanes of a and b in turn, a first: the first half and the second half.
+  static Float interleave_low(Float a, Float b) {
+    return _mm512_permutex2var_ps(
+        a, _mm512_setr_epi32(0, 16, 1, 17, 2, 18, 3, 19, 4, 20, 5, 21, 6, 22, 7, 23), b);
+  }
+  static Float interleave_high(Float a, Float b) {
+    return _mm512_permutex2var_ps(
+        a, _mm512_setr_epi32(8, 24, 9, 25, 10, 26, 11, 27, 12, 28, 13, 29, 14, 30, 15, 31), b);
+  }
+  // Lanes 4 j ... 4 j + 3: a, a, b, a of lane j of the given quarter.
+  static Float spread_quarter(Float a, Float b, int quarter) {
+    const Int order = add32(_mm512_setr_epi32(0, 0, 16, 0, 1, 1, 17, 1, 2, 2, 18, 2, 3, 3, 19, 3),
+                            set32(4 * quarter));
+    return _mm512_permutex2var_ps(a, order, b);
+  }
+  static Float set_four(float a, float b, float c, float d) { return _mm512_setr4_ps(a, b, c, d); }
   static Float add(Float a, Float b) { return _mm512_add_ps(a, b); }
   static Float sub(Float a, Float b) { return _mm512_sub_ps(a, b); }
   static Float mul(Float a, Float b) { return _mm512_mul_ps(a, b); }
@@ -140,6 +187,43 @@ struct Avx512 {
 
     Int a, b, c, d;
   };
+
+ private:
+  // Indices for two byte permutations: the first takes from two vectors, the second from its result
+  // (0 ... 63) and a third vector (64 ... 127).
+  struct ByteOrder {
+    uint8_t first[64];
+    uint8_t second[64];
+  };
+
+  // Byte i of a channel is byte 3 i + channel of 192.
+  static constexpr ByteOrder split_order(int channel) {
+    ByteOrder order = {};
+    for (int i = 0; i < 64; ++i) {
+      const int source = 3 * i + channel;
+      order.first[i] = static_cast<uint8_t>(source % 128);
+      order.second[i] = static_cast<uint8_t>(source < 128 ? i : source - 64);
+    }
+    return order;
+  }
+  // Byte i of a part is byte (64 part + i) / 3 of channel (64 part + i) % 3.
+  static constexpr ByteOrder join_order(int part) {
+    ByteOrder order = {};
+    for (int i = 0; i < 64; ++i) {
+      const int pixel = (64 * part + i) / 3;
+      const int channel = (64 * part + i) % 3;
+      order.first[i] = static_cast<uint8_t>(channel == 1 ? 64 + pixel : pixel);
+      order.second[i] = static_cast<uint8_t>(channel == 2 ? 64 + pixel : i);
+    }
+    return order;
+  }
+  static const ByteOrder kSplitOrder[3];
+  static const ByteOrder kJoinOrder[3];
 };
+
+inline constexpr Avx512::ByteOrder Avx512::kSplitOrder[3] = {split_order(0), split_order(1),
+                                                             split_order(2)};
+inline constexpr Avx512::ByteOrder Avx512::kJoinOrder[3] = {join_order(0), join_order(1),
+                                                            join_order(2)};
 
 }  // namespace haze

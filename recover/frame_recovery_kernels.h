@@ -21,6 +21,12 @@ int recover_planar_blocks_avx2(BlockRow row, const uint8_t* codes, int blocks, L
                                const uint8_t* tone_curve);
 int recover_planar_blocks_avx512(BlockRow row, const uint8_t* codes, int blocks, LightAnchor anchor,
                                  const uint8_t* tone_curve);
+
+// The same for NV21 from float transmissions, by division.
+int recover_by_division_avx2(BlockRow row, const float* t, int blocks, LightAnchor anchor,
+                             const uint8_t* tone_curve);
+int recover_by_division_avx512(BlockRow row, const float* t, int blocks, LightAnchor anchor,
+                               const uint8_t* tone_curve);
 #endif
 
 }  // namespace haze::recover
