@@ -18,7 +18,7 @@ if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(x86_64|AMD64)$" AND NOT HAZE_PREVIEW_PORTAB
   endif()
   foreach(level avx2 avx512)
     list(TRANSFORM x86_kernels APPEND _${level}.cpp OUTPUT_VARIABLE sources)
-    target_sources(haze_preview PRIVATE ${sources})
+    target_sources(haze_preview_objects PRIVATE ${sources})
     set_source_files_properties(${sources} PROPERTIES COMPILE_OPTIONS "${${level}_flags}")
   endforeach()
 endif()
