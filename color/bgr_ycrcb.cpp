@@ -2,7 +2,7 @@
 #include <stddef.h>
 #include <stdint.h>
 
-#include "color/bt601.h"
+#include "color/bgr_ycrcb_kernels.h"
 #include "core/image_size.h"
 #include "core/numeric.h"
 #include "haze_preview.h"
@@ -12,37 +12,17 @@ namespace {
 using haze::clamp_to_byte;
 using haze::pixel_count;
 using haze::color::cb_of;
-using haze::color::channel_offsets;
-using haze::color::ChannelOffsets;
 using haze::color::cr_of;
-using haze::color::kChromaZero;
 using haze::color::luma_of;
 
 }  // namespace
 
 void BGR2YCrCbPreview(unsigned char* bgr, unsigned char* ycrcb, int width, int height) {
-  const size_t count = pixel_count(width, height);
-  for (size_t i = 0; i < count; ++i) {
-    const int blue = bgr[3 * i];
-    const int red = bgr[3 * i + 2];
-    const int luma = luma_of(blue, bgr[3 * i + 1], red);
-    ycrcb[3 * i] = static_cast<uint8_t>(luma);
-    // Not clamped: a Cr or Cb of 256, as pure red gives it, is stored as 0.
-    ycrcb[3 * i + 1] = static_cast<uint8_t>(cr_of(red, luma));
-    ycrcb[3 * i + 2] = static_cast<uint8_t>(cb_of(blue, luma));
-  }
+  haze::color::bgr_to_ycrcb(bgr, ycrcb, pixel_count(width, height));
 }
 
 void YCrCb2BGRPreview(unsigned char* ycrcb, unsigned char* bgr, int width, int height) {
-  const size_t count = pixel_count(width, height);
-  for (size_t i = 0; i < count; ++i) {
-    const int luma = ycrcb[3 * i];
-    const ChannelOffsets offset =
-        channel_offsets(ycrcb[3 * i + 1] - kChromaZero, ycrcb[3 * i + 2] - kChromaZero);
-    bgr[3 * i] = clamp_to_byte(luma + offset.blue);
-    bgr[3 * i + 1] = clamp_to_byte(luma + offset.green);
-    bgr[3 * i + 2] = clamp_to_byte(luma + offset.red);
-  }
+  haze::color::ycrcb_to_bgr(ycrcb, bgr, pixel_count(width, height));
 }
 
 // The two-byte layout: even columns hold Y, Cb and odd ones Y, Cr. An odd width or height ends in

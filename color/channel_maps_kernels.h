@@ -4,6 +4,7 @@
 #include <stddef.h>
 #include <stdint.h>
 
+#include "core/cpu_level.h"
 #include "core/numeric.h"
 #include "core/target.h"
 
@@ -53,10 +54,21 @@ inline size_t min_max_maps_neon(const uint8_t* pixels, uint8_t* min_map, uint8_t
 }
 #endif
 
+#if HAZE_X86
+// Same bytes; each returns the first pixel that it did not write.
+size_t min_map_avx2(const uint8_t* pixels, uint8_t* min_map, size_t end);
+size_t min_map_avx512(const uint8_t* pixels, uint8_t* min_map, size_t end);
+size_t min_max_maps_avx2(const uint8_t* pixels, uint8_t* min_map, uint8_t* max_map, size_t end);
+size_t min_max_maps_avx512(const uint8_t* pixels, uint8_t* min_map, uint8_t* max_map, size_t end);
+#endif
+
 inline void min_map(const uint8_t* pixels, uint8_t* least, size_t count) {
   size_t done = 0;
 #if HAZE_NEON
   done = min_map_neon(pixels, least, count);
+#elif HAZE_X86
+  if (const auto kernel = x86_kernel(min_map_avx2, min_map_avx512))
+    done = kernel(pixels, least, count);
 #endif
   min_map_portable(pixels, least, done, count);
 }
@@ -65,6 +77,9 @@ inline void min_max_maps(const uint8_t* pixels, uint8_t* least, uint8_t* most, s
   size_t done = 0;
 #if HAZE_NEON
   done = min_max_maps_neon(pixels, least, most, count);
+#elif HAZE_X86
+  if (const auto kernel = x86_kernel(min_max_maps_avx2, min_max_maps_avx512))
+    done = kernel(pixels, least, most, count);
 #endif
   min_max_maps_portable(pixels, least, most, done, count);
 }

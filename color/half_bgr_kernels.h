@@ -5,6 +5,7 @@
 
 #include "color/bt601.h"
 #include "color/bt601_neon.h"
+#include "core/cpu_level.h"
 #include "core/numeric.h"
 #include "core/target.h"
 
@@ -43,11 +44,19 @@ inline int half_bgr_row_neon(const uint8_t* luma, const uint8_t* vu, uint8_t* bg
 }
 #endif
 
+#if HAZE_X86
+int half_bgr_row_avx2(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int end);
+int half_bgr_row_avx512(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int end);
+#endif
+
 // `vu` is a row of NV21 chroma.
 inline void half_bgr_row_nv21(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int width) {
   int x = 0;
 #if HAZE_NEON
   x = half_bgr_row_neon(luma, vu, bgr, width);
+#elif HAZE_X86
+  if (const auto kernel = x86_kernel(half_bgr_row_avx2, half_bgr_row_avx512))
+    x = kernel(luma, vu, bgr, width);
 #endif
   half_bgr_row_portable<2>(luma, vu, vu + 1, bgr, x, width);
 }

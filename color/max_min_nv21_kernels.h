@@ -5,6 +5,7 @@
 
 #include "color/bt601.h"
 #include "color/bt601_neon.h"
+#include "core/cpu_level.h"
 #include "core/numeric.h"
 #include "core/target.h"
 
@@ -45,11 +46,22 @@ inline int max_min_row_neon(const uint8_t* luma, const uint8_t* chroma, uint8_t*
 }
 #endif
 
+#if HAZE_X86
+// Same bytes, in files of their own for each level.
+int max_min_row_avx2(const uint8_t* luma, const uint8_t* chroma, uint8_t* min_out, uint8_t* max_out,
+                     int end);
+int max_min_row_avx512(const uint8_t* luma, const uint8_t* chroma, uint8_t* min_out,
+                       uint8_t* max_out, int end);
+#endif
+
 inline void max_min_row(const uint8_t* luma, const uint8_t* chroma, uint8_t* min_out,
                         uint8_t* max_out, int width) {
   int x = 0;
 #if HAZE_NEON
   x = max_min_row_neon(luma, chroma, min_out, max_out, width);
+#elif HAZE_X86
+  if (const auto kernel = x86_kernel(max_min_row_avx2, max_min_row_avx512))
+    x = kernel(luma, chroma, min_out, max_out, width);
 #endif
   max_min_row_portable(luma, chroma, min_out, max_out, x, width);
 }

@@ -24,12 +24,8 @@ void transmission_map(const uint8_t* mean, const uint8_t* minimum, uint8_t* code
                       int height, float strength, float inv_a) {
   const size_t count = haze::pixel_count(width, height);
   const size_t grouped = count & ~(haze::estimate::kGroup - 1);
-  const haze::estimate::GroupArguments arguments = haze::estimate::group_arguments(strength, inv_a);
-  size_t done = 0;
-#if HAZE_NEON
-  done = haze::estimate::group_codes_neon<kHighLanes>(mean, minimum, codes, grouped, arguments);
-#endif
-  haze::estimate::group_codes_portable<kHighLanes>(mean, minimum, codes, done, grouped, arguments);
+  haze::estimate::group_codes<kHighLanes>(mean, minimum, codes, grouped,
+                                          haze::estimate::group_arguments(strength, inv_a));
   haze::estimate::tail_codes(mean, minimum, codes, grouped, count, strength, inv_a);
 }
 

@@ -9,6 +9,7 @@
 #include <stddef.h>
 #include <stdint.h>
 
+#include "core/cpu_level.h"
 #include "core/target.h"
 #include "estimate/transmission_code.h"
 
@@ -108,6 +109,30 @@ inline size_t group_codes_neon(const uint8_t* mean, const uint8_t* minimum, uint
   return i;
 }
 #endif
+
+#if HAZE_X86
+// Same bytes with the pixels' own minima; each returns the first pixel that it did not write.
+size_t group_codes_avx2(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
+                        float strength, float minus_inv_a);
+size_t group_codes_avx512(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
+                          float strength, float minus_inv_a);
+#endif
+
+// Codes of whole groups, pixels [0, end).
+template <HighLanes kHighLanes>
+inline void group_codes(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
+                        GroupArguments arguments) {
+  size_t done = 0;
+#if HAZE_NEON
+  done = group_codes_neon<kHighLanes>(mean, minimum, codes, end, arguments);
+#elif HAZE_X86
+  if constexpr (kHighLanes == HighLanes::kOwn) {
+    if (const auto kernel = x86_kernel(group_codes_avx2, group_codes_avx512))
+      done = kernel(mean, minimum, codes, end, arguments.strength, arguments.minus_inv_a);
+  }
+#endif
+  group_codes_portable<kHighLanes>(mean, minimum, codes, done, end, arguments);
+}
 
 // Codes of the pixels after the last group. The bounds are compared in double precision, which
 // gives the same bytes: 0.4f and 0.99f are the floats next above 0.4 and 0.99.

@@ -36,33 +36,37 @@ struct ProductTerm {
 #endif
 };
 
-// sums[x] = row(x).
+// One row of column sums from the one above, columns [begin, end).
+//
+// sums[x] = row(x), for the first row
 template <typename Term>
 inline void start_columns_portable(float* sums, Term row, ptrdiff_t begin, ptrdiff_t end) {
   for (ptrdiff_t x = begin; x < end; ++x) sums[x] = row(x);
 }
 
-// sums[x] += row(x): a row enters the window.
+// sums[x] = above[x] + row(x): a row enters the window.
 template <typename Term>
-inline void add_row_portable(float* sums, Term row, ptrdiff_t begin, ptrdiff_t end) {
-  for (ptrdiff_t x = begin; x < end; ++x) sums[x] += row(x);
+inline void add_row_portable(const float* above, float* sums, Term row, ptrdiff_t begin,
+                             ptrdiff_t end) {
+  for (ptrdiff_t x = begin; x < end; ++x) sums[x] = above[x] + row(x);
 }
 
-// sums[x] -= row(x): a row leaves it.
+// sums[x] = above[x] - row(x): a row leaves it.
 template <typename Term>
-inline void subtract_row_portable(float* sums, Term row, ptrdiff_t begin, ptrdiff_t end) {
-  for (ptrdiff_t x = begin; x < end; ++x) sums[x] -= row(x);
+inline void subtract_row_portable(const float* above, float* sums, Term row, ptrdiff_t begin,
+                                  ptrdiff_t end) {
+  for (ptrdiff_t x = begin; x < end; ++x) sums[x] = above[x] - row(x);
 }
 
-// A row enters and another leaves. The difference is formed first.
+// A row enters and another leaves. Their difference is formed first.
 template <typename Term>
-inline void slide_rows_portable(float* sums, Term entering, Term leaving, ptrdiff_t begin,
-                                ptrdiff_t end) {
-  for (ptrdiff_t x = begin; x < end; ++x) sums[x] += entering(x) - leaving(x);
+inline void slide_rows_portable(const float* above, float* sums, Term entering, Term leaving,
+                                ptrdiff_t begin, ptrdiff_t end) {
+  for (ptrdiff_t x = begin; x < end; ++x) sums[x] = above[x] + (entering(x) - leaving(x));
 }
 
 #if HAZE_NEON
-// The same for whole steps of four; each returns the first column that it did not touch. Compilers
+// The same for whole steps of four; each returns the first column that it did not write. Compilers
 // leave float loops scalar on 32-bit ARM, since NEON takes numbers below the normal range as zero.
 template <typename Term>
 inline ptrdiff_t start_columns_neon(float* sums, Term row, ptrdiff_t end) {
@@ -72,25 +76,26 @@ inline ptrdiff_t start_columns_neon(float* sums, Term row, ptrdiff_t end) {
 }
 
 template <typename Term>
-inline ptrdiff_t add_row_neon(float* sums, Term row, ptrdiff_t end) {
+inline ptrdiff_t add_row_neon(const float* above, float* sums, Term row, ptrdiff_t end) {
   ptrdiff_t x = 0;
-  for (; x + 4 <= end; x += 4) vst1q_f32(sums + x, vaddq_f32(vld1q_f32(sums + x), row.four(x)));
+  for (; x + 4 <= end; x += 4) vst1q_f32(sums + x, vaddq_f32(vld1q_f32(above + x), row.four(x)));
   return x;
 }
 
 template <typename Term>
-inline ptrdiff_t subtract_row_neon(float* sums, Term row, ptrdiff_t end) {
+inline ptrdiff_t subtract_row_neon(const float* above, float* sums, Term row, ptrdiff_t end) {
   ptrdiff_t x = 0;
-  for (; x + 4 <= end; x += 4) vst1q_f32(sums + x, vsubq_f32(vld1q_f32(sums + x), row.four(x)));
+  for (; x + 4 <= end; x += 4) vst1q_f32(sums + x, vsubq_f32(vld1q_f32(above + x), row.four(x)));
   return x;
 }
 
 template <typename Term>
-inline ptrdiff_t slide_rows_neon(float* sums, Term entering, Term leaving, ptrdiff_t end) {
+inline ptrdiff_t slide_rows_neon(const float* above, float* sums, Term entering, Term leaving,
+                                 ptrdiff_t end) {
   ptrdiff_t x = 0;
   for (; x + 4 <= end; x += 4) {
     const float32x4_t change = vsubq_f32(entering.four(x), leaving.four(x));
-    vst1q_f32(sums + x, vaddq_f32(vld1q_f32(sums + x), change));
+    vst1q_f32(sums + x, vaddq_f32(vld1q_f32(above + x), change));
   }
   return x;
 }
@@ -106,57 +111,84 @@ inline void start_columns(float* sums, Term row, ptrdiff_t width) {
 }
 
 template <typename Term>
-inline void add_row(float* sums, Term row, ptrdiff_t width) {
+inline void add_row(const float* above, float* sums, Term row, ptrdiff_t width) {
   ptrdiff_t x = 0;
 #if HAZE_NEON
-  x = add_row_neon(sums, row, width);
+  x = add_row_neon(above, sums, row, width);
 #endif
-  add_row_portable(sums, row, x, width);
+  add_row_portable(above, sums, row, x, width);
 }
 
 template <typename Term>
-inline void subtract_row(float* sums, Term row, ptrdiff_t width) {
+inline void subtract_row(const float* above, float* sums, Term row, ptrdiff_t width) {
   ptrdiff_t x = 0;
 #if HAZE_NEON
-  x = subtract_row_neon(sums, row, width);
+  x = subtract_row_neon(above, sums, row, width);
 #endif
-  subtract_row_portable(sums, row, x, width);
+  subtract_row_portable(above, sums, row, x, width);
 }
 
 template <typename Term>
-inline void slide_rows(float* sums, Term entering, Term leaving, ptrdiff_t width) {
+inline void slide_rows(const float* above, float* sums, Term entering, Term leaving,
+                       ptrdiff_t width) {
   ptrdiff_t x = 0;
 #if HAZE_NEON
-  x = slide_rows_neon(sums, entering, leaving, width);
+  x = slide_rows_neon(above, sums, entering, leaving, width);
 #endif
-  slide_rows_portable(sums, entering, leaving, x, width);
+  slide_rows_portable(above, sums, entering, leaving, x, width);
 }
 
-// Means of one output row from its column sums; `rows` is the number of rows in the window. The
-// count grows at the left border, stays in the middle and shrinks at the right one. Needs width >=
-// 2 * radius + 1.
-inline void mean_row_float(const float* sums, float* dst, int width, int radius, float rows) {
-  float sum = sums[0];
-  float count = static_cast<float>(radius) * rows;
-  for (int x = 1; x < radius; ++x) sum += sums[x];
+// values[x] /= divisor
+inline void divide_by(float* values, int count, float divisor) {
+  for (int x = 0; x < count; ++x) values[x] /= divisor;
+}
+
+// kRows neighbouring output rows: their column sums, their means, and how many rows each of their
+// windows has.
+template <int kRows>
+struct RowGroup {
+  const float* sums[kRows];
+  float* dst[kRows];
+  float rows[kRows];
+};
+
+// Means of a group of output rows from their column sums. The count of pixels grows at the left
+// border, stays in the middle and shrinks at the right one. Needs width >= 2 * radius + 1.
+template <int kRows>
+inline void mean_rows(const RowGroup<kRows>& group, int width, int radius) {
+  float sum[kRows];
+  float count[kRows];
+  for (int k = 0; k < kRows; ++k) {
+    sum[k] = group.sums[k][0];
+    for (int x = 1; x < radius; ++x) sum[k] += group.sums[k][x];
+    count[k] = static_cast<float>(radius) * group.rows[k];
+  }
   int x = 0;
   for (; x <= radius; ++x) {
-    sum += sums[x + radius];
-    count += rows;
-    dst[x] = sum / count;
+    for (int k = 0; k < kRows; ++k) {
+      sum[k] += group.sums[k][x + radius];
+      count[k] += group.rows[k];
+      group.dst[k][x] = sum[k] / count[k];
+    }
   }
-  // Sums first and quotients afterwards, so that the divisions can go side by side.
+  // Sums first and quotients afterwards, so that divisions by one count can go side by side.
   const int right = width - radius;
   for (; x < right; ++x) {
-    sum += sums[x + radius] - sums[x - radius - 1];
-    dst[x] = sum;
+    for (int k = 0; k < kRows; ++k) {
+      sum[k] += group.sums[k][x + radius] - group.sums[k][x - radius - 1];
+      group.dst[k][x] = sum[k];
+    }
   }
-  count = static_cast<float>(2 * radius + 1) * rows;
-  for (int middle = radius + 1; middle < right; ++middle) dst[middle] /= count;
+  for (int k = 0; k < kRows; ++k) {
+    count[k] = static_cast<float>(2 * radius + 1) * group.rows[k];
+    divide_by(group.dst[k] + radius + 1, right - radius - 1, count[k]);
+  }
   for (; x < width; ++x) {
-    sum -= sums[x - radius - 1];
-    count -= rows;
-    dst[x] = sum / count;
+    for (int k = 0; k < kRows; ++k) {
+      sum[k] -= group.sums[k][x - radius - 1];
+      count[k] -= group.rows[k];
+      group.dst[k][x] = sum[k] / count[k];
+    }
   }
 }
 

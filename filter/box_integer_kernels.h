@@ -5,6 +5,7 @@
 #include <stddef.h>
 #include <stdint.h>
 
+#include "core/cpu_level.h"
 #include "core/numeric.h"
 
 namespace haze::filter {
@@ -27,10 +28,44 @@ inline void subtract_row(Sum* sums, const uint8_t* row, int width) {
   for (int x = 0; x < width; ++x) sums[x] = static_cast<Sum>(sums[x] - row[x]);
 }
 
-// A row enters and another leaves.
+// A row enters and another leaves, columns [begin, end).
 template <typename Sum>
-inline void slide_rows(Sum* sums, const uint8_t* entering, const uint8_t* leaving, int width) {
-  for (int x = 0; x < width; ++x) sums[x] = static_cast<Sum>(sums[x] + (entering[x] - leaving[x]));
+inline void slide_rows_portable(Sum* sums, const uint8_t* entering, const uint8_t* leaving,
+                                int begin, int end) {
+  for (int x = begin; x < end; ++x)
+    sums[x] = static_cast<Sum>(sums[x] + (entering[x] - leaving[x]));
+}
+
+#if HAZE_X86
+// Same sums; each returns the first column that it did not touch.
+int slide_rows_avx2(int16_t* sums, const uint8_t* entering, const uint8_t* leaving, int width);
+int slide_rows_avx512(int16_t* sums, const uint8_t* entering, const uint8_t* leaving, int width);
+
+// Means of windows that move on by one column per pixel: `sum` is the window's before the first of
+// them; entering[x] and leaving[x] are the column sums that pixel x adds and drops. Returns the first
+// pixel that it did not write, and leaves the sum of the pixel before it. For sums below 2^24 and
+// counts up to 2^16.
+int mean_windows_16_avx2(const int16_t* entering, const int16_t* leaving, uint8_t* dst, int pixels,
+                         int32_t& sum, int count);
+int mean_windows_16_avx512(const int16_t* entering, const int16_t* leaving, uint8_t* dst,
+                           int pixels, int32_t& sum, int count);
+int mean_windows_32_avx2(const int32_t* entering, const int32_t* leaving, uint8_t* dst, int pixels,
+                         int32_t& sum, int count);
+int mean_windows_32_avx512(const int32_t* entering, const int32_t* leaving, uint8_t* dst,
+                           int pixels, int32_t& sum, int count);
+#endif
+
+inline void slide_rows(int32_t* sums, const uint8_t* entering, const uint8_t* leaving, int width) {
+  slide_rows_portable(sums, entering, leaving, 0, width);
+}
+
+inline void slide_rows(int16_t* sums, const uint8_t* entering, const uint8_t* leaving, int width) {
+  int x = 0;
+#if HAZE_X86
+  if (const auto kernel = x86_kernel(slide_rows_avx2, slide_rows_avx512))
+    x = kernel(sums, entering, leaving, width);
+#endif
+  slide_rows_portable(sums, entering, leaving, x, width);
 }
 
 // How far a window reaches from its centre: rows y - before ... y + after, columns likewise.
@@ -44,27 +79,57 @@ constexpr int window_count(int position, Reach reach, int size) {
   return min(position + reach.after, size - 1) - max(position - reach.before, 0) + 1;
 }
 
-// Means of one output row: dst[x] = quotient(sum of column sums in the window of x, its columns).
+// The vector part of a row's full windows: returns how many pixels it wrote, none where there is no
+// vector path. `sum` moves on with them.
+inline int mean_windows(const int16_t* entering, const int16_t* leaving, uint8_t* dst, int pixels,
+                        int32_t& sum, int count) {
+#if HAZE_X86
+  if (const auto kernel = x86_kernel(mean_windows_16_avx2, mean_windows_16_avx512))
+    return kernel(entering, leaving, dst, pixels, sum, count);
+#endif
+  (void)entering, (void)leaving, (void)dst, (void)pixels, (void)sum, (void)count;
+  return 0;
+}
+
+inline int mean_windows(const int32_t* entering, const int32_t* leaving, uint8_t* dst, int pixels,
+                        int32_t& sum, int count) {
+#if HAZE_X86
+  if (const auto kernel = x86_kernel(mean_windows_32_avx2, mean_windows_32_avx512))
+    return kernel(entering, leaving, dst, pixels, sum, count);
+#endif
+  (void)entering, (void)leaving, (void)dst, (void)pixels, (void)sum, (void)count;
+  return 0;
+}
+
+// Sums that may pass 2^24.
+inline int mean_windows(const int32_t*, const int32_t*, uint8_t*, int, double&, int) { return 0; }
+
+// Means of one output row: dst[x] = divide(sum of the column sums in the window of x, rows, columns).
 // The window grows at the left border, keeps its width in the middle and shrinks at the right one.
-// `edge` divides for a count of columns, `full` for the full width. Needs width >= before + after
-// + 1.
-template <typename RowSum, typename Sum, typename Edge, typename Full>
-inline void mean_row(const Sum* sums, uint8_t* dst, int width, Reach reach, Edge edge, Full full) {
+// Needs width >= before + after + 1.
+template <typename RowSum, typename Sum, typename Divide>
+inline void mean_row(const Sum* sums, uint8_t* dst, int width, Reach reach, int rows,
+                     Divide divide) {
+  const Sum* const entering = sums + reach.after;
+  const Sum* const leaving = sums - reach.before - 1;
+  const int window = reach.before + reach.after + 1;
   RowSum sum = 0;
-  for (int x = 0; x < reach.after; ++x) sum += static_cast<RowSum>(sums[x]);
+  for (int x = 0; x < reach.after; ++x) sum += sums[x];
   int x = 0;
   for (; x <= reach.before; ++x) {
-    sum += static_cast<RowSum>(sums[x + reach.after]);
-    dst[x] = edge(sum, reach.after + 1 + x);
+    sum += entering[x];
+    dst[x] = divide(sum, rows, reach.after + 1 + x);
   }
-  for (; x < width - reach.after; ++x) {
-    sum += static_cast<RowSum>(sums[x + reach.after]);
-    sum -= static_cast<RowSum>(sums[x - reach.before - 1]);
-    dst[x] = full(sum);
+  const int right = width - reach.after;
+  x += mean_windows(entering + x, leaving + x, dst + x, right - x, sum, rows * window);
+  for (; x < right; ++x) {
+    sum += entering[x];
+    sum -= leaving[x];
+    dst[x] = divide(sum, rows, window);
   }
   for (; x < width; ++x) {
-    sum -= static_cast<RowSum>(sums[x - reach.before - 1]);
-    dst[x] = edge(sum, width - x + reach.before);
+    sum -= leaving[x];
+    dst[x] = divide(sum, rows, width - x + reach.before);
   }
 }
 

@@ -2,8 +2,10 @@
 #include <stddef.h>
 #include <stdint.h>
 
+#include <initializer_list>
+
 #include "haze_preview.h"
-#include "recover/light_anchor.h"
+#include "recover/frame_recovery_kernels.h"
 
 namespace {
 
@@ -14,18 +16,29 @@ uint8_t recover_by_division(int anchor, uint8_t sample, float t) {
   return static_cast<uint8_t>(static_cast<int>(below_256 > 0.0f ? below_256 : 0.0f));
 }
 
-// Two samples that share a transmission, for every transmission of a row.
-void recover_pairs(uint8_t* samples, const float* t, int pairs, int first_anchor,
-                   int second_anchor) {
-  for (int x = 0; x < pairs; ++x) {
-    samples[2 * x] = recover_by_division(first_anchor, samples[2 * x], t[x]);
-    samples[2 * x + 1] = recover_by_division(second_anchor, samples[2 * x + 1], t[x]);
-  }
+using haze::recover::BlockRow;
+using haze::recover::LightAnchor;
+
+// Recovers the first blocks of a row in vectors where there are any; returns how many.
+int leading_blocks(BlockRow row, const float* t, int blocks, LightAnchor anchor) {
+#if HAZE_X86
+  if (const auto kernel = haze::x86_kernel(haze::recover::recover_by_division_avx2,
+                                           haze::recover::recover_by_division_avx512))
+    return kernel(row, t, blocks, anchor, LutTablePreview);
+#endif
+  (void)row, (void)t, (void)blocks, (void)anchor;
+  return 0;
 }
 
-void recover_luma(uint8_t* row, const float* t, int pairs, int anchor) {
-  recover_pairs(row, t, pairs, anchor, anchor);
-  for (int x = 0; x < 2 * pairs; ++x) row[x] = LutTablePreview[row[x]];
+// Blocks [begin, end) of a row of NV21 blocks.
+void recover_blocks(BlockRow row, const float* t, int begin, int end, LightAnchor anchor) {
+  for (int x = begin; x < end; ++x) {
+    for (uint8_t* luma : {row.luma_top + 2 * x, row.luma_top + 2 * x + 1, row.luma_bottom + 2 * x,
+                          row.luma_bottom + 2 * x + 1})
+      *luma = LutTablePreview[recover_by_division(anchor.y, *luma, t[x])];
+    row.v[2 * x] = recover_by_division(anchor.v, row.v[2 * x], t[x]);
+    row.u[2 * x] = recover_by_division(anchor.u, row.u[2 * x], t[x]);
+  }
 }
 
 }  // namespace
@@ -33,14 +46,14 @@ void recover_luma(uint8_t* row, const float* t, int pairs, int anchor) {
 void HazeRemoving3Preview_NV21_f(unsigned char* frame, float* transmission, unsigned char* light,
                                  int width, int height, int /*recoverArg*/) {
   if (width < 2 || height < 2) return;
-  const haze::recover::LightAnchor anchor = haze::recover::light_anchor(light);
+  const LightAnchor anchor = haze::recover::light_anchor(light);
   const int blocks = width / 2;
   uint8_t* const chroma = frame + static_cast<ptrdiff_t>(width) * height;
   for (int y = 0; y < height / 2; ++y) {
     const float* const t = transmission + static_cast<ptrdiff_t>(y) * blocks;
     uint8_t* const top = frame + static_cast<ptrdiff_t>(2 * y) * width;
-    recover_luma(top, t, blocks, anchor.y);
-    recover_luma(top + width, t, blocks, anchor.y);
-    recover_pairs(chroma + static_cast<ptrdiff_t>(y) * width, t, blocks, anchor.v, anchor.u);
+    uint8_t* const vu = chroma + static_cast<ptrdiff_t>(y) * width;
+    const BlockRow row = {top, top + width, vu, vu + 1};
+    recover_blocks(row, t, leading_blocks(row, t, blocks, anchor), blocks, anchor);
   }
 }

@@ -4,27 +4,20 @@
 
 #include "core/numeric.h"
 #include "haze_preview.h"
-#include "recover/recovery_kernels.h"
+#include "recover/frame_recovery_kernels.h"
 
 namespace haze::recover {
 namespace {
-
-// One row of 2 x 2 blocks: two luma rows and the chroma samples that belong to them.
-struct BlockRow {
-  uint8_t* luma_top;
-  uint8_t* luma_bottom;
-  uint8_t* v;
-  uint8_t* u;
-};
 
 // Recovered bytes by lookup, for codes below kTableCodes.
 struct FromTables {
   const RecoveryTables& tables;
 
   const CodeTable& operator()(int code) const { return tables.codes[code]; }
+  int leading_blocks(BlockRow, const uint8_t*, int, ChromaLayout) const { return 0; }
 };
 
-// Recovered bytes by the formula, for codes that no table holds.
+// Recovered bytes by the formula, for every code.
 struct FromFormula {
   struct Samples {
     struct Luma {
@@ -49,12 +42,25 @@ struct FromFormula {
     const float factor = recovery_factor(code);
     return {{anchor.y, factor}, {anchor.v, factor}, {anchor.u, factor}};
   }
+
+  // Recovers the row's first blocks in vectors where there are any; returns how many.
+  int leading_blocks(BlockRow row, const uint8_t* codes, int blocks, ChromaLayout layout) const {
+#if HAZE_X86
+    if (const auto kernel =
+            layout == ChromaLayout::kInterleavedVu
+                ? x86_kernel(recover_nv21_blocks_avx2, recover_nv21_blocks_avx512)
+                : x86_kernel(recover_planar_blocks_avx2, recover_planar_blocks_avx512))
+      return kernel(row, codes, blocks, anchor, LutTablePreview);
+#endif
+    (void)row, (void)codes, (void)blocks, (void)layout;
+    return 0;
+  }
 };
 
-// `kChromaStep` bytes lie between chroma samples of one kind.
+// Blocks [begin, end); `kChromaStep` bytes lie between chroma samples of one kind.
 template <int kChromaStep, typename Recovered>
-void recover_blocks(BlockRow row, const uint8_t* codes, int blocks, Recovered recovered) {
-  for (int x = 0; x < blocks; ++x) {
+void recover_blocks(BlockRow row, const uint8_t* codes, int begin, int end, Recovered recovered) {
+  for (int x = begin; x < end; ++x) {
     const auto& to = recovered(codes[x]);
     row.luma_top[2 * x] = to.luma[row.luma_top[2 * x]];
     row.luma_top[2 * x + 1] = to.luma[row.luma_top[2 * x + 1]];
@@ -65,63 +71,101 @@ void recover_blocks(BlockRow row, const uint8_t* codes, int blocks, Recovered re
   }
 }
 
-template <typename Recovered>
-void recover_with(uint8_t* frame, CodeMap map, int width, int height, ChromaLayout layout,
-                  Recovered recovered) {
-  const int blocks = width / 2;
-  const ptrdiff_t luma_bytes = static_cast<ptrdiff_t>(width) * height;
-  uint8_t* const chroma = frame + luma_bytes;
-  for (int y = 0; y < height / 2; ++y) {
+// A packed frame of even size with its map of transmission codes.
+struct MappedFrame {
+  uint8_t* frame;
+  CodeMap map;
+  int width;
+  int height;
+  ChromaLayout layout;
+
+  int blocks() const { return width / 2; }
+  int block_rows() const { return height / 2; }
+  const uint8_t* codes(int y) const {
+    return map.codes + static_cast<ptrdiff_t>(y) * map.row_bytes;
+  }
+  BlockRow row(int y) const {
+    const ptrdiff_t luma_bytes = static_cast<ptrdiff_t>(width) * height;
     uint8_t* const luma = frame + static_cast<ptrdiff_t>(2 * y) * width;
-    const uint8_t* const codes = map.codes + static_cast<ptrdiff_t>(y) * map.row_bytes;
     if (layout == ChromaLayout::kInterleavedVu) {
-      uint8_t* const vu = chroma + static_cast<ptrdiff_t>(y) * width;
-      recover_blocks<2>({luma, luma + width, vu, vu + 1}, codes, blocks, recovered);
-    } else {
-      uint8_t* const u = chroma + static_cast<ptrdiff_t>(y) * blocks;
-      recover_blocks<1>({luma, luma + width, u + luma_bytes / 4, u}, codes, blocks, recovered);
+      uint8_t* const vu = frame + luma_bytes + static_cast<ptrdiff_t>(y) * width;
+      return {luma, luma + width, vu, vu + 1};
     }
+    uint8_t* const u = frame + luma_bytes + static_cast<ptrdiff_t>(y) * blocks();
+    return {luma, luma + width, u + luma_bytes / 4, u};
+  }
+};
+
+template <typename Recovered>
+void recover_with(const MappedFrame& frame, Recovered recovered) {
+  for (int y = 0; y < frame.block_rows(); ++y) {
+    const BlockRow row = frame.row(y);
+    const uint8_t* const codes = frame.codes(y);
+    const int done = recovered.leading_blocks(row, codes, frame.blocks(), frame.layout);
+    if (frame.layout == ChromaLayout::kInterleavedVu)
+      recover_blocks<2>(row, codes, done, frame.blocks(), recovered);
+    else
+      recover_blocks<1>(row, codes, done, frame.blocks(), recovered);
   }
 }
 
-bool has_table_for_all(CodeMap map, int blocks, int rows) {
+bool has_table_for_all(const MappedFrame& frame) {
   uint8_t most = 0;
-  for (int y = 0; y < rows; ++y) {
-    const uint8_t* const codes = map.codes + static_cast<ptrdiff_t>(y) * map.row_bytes;
-    for (int x = 0; x < blocks; ++x) most = max(most, codes[x]);
-  }
+  for (int y = 0; y < frame.block_rows(); ++y)
+    for (int x = 0; x < frame.blocks(); ++x) most = max(most, frame.codes(y)[x]);
   return most < kTableCodes;
 }
 
-void recover_packed(uint8_t* frame, const uint8_t* transmission, const uint8_t* light_bgr,
-                    int width, int height, ChromaLayout layout) {
-  if (width < 2 || height < 2) return;
-  const LightAnchor anchor = light_anchor(light_bgr);
+// Whether vectors do the arithmetic faster than tables are looked up.
+bool prefers_formula() {
+#if HAZE_X86
+  return cpu_level() != CpuLevel::kPortable;
+#else
+  return false;
+#endif
+}
+
+// In a function of its own for the sake of the stack: the tables take 120 KiB.
+__attribute__((noinline)) void recover_with_new_tables(const MappedFrame& frame,
+                                                       LightAnchor anchor) {
   RecoveryTables tables;
   build_tables(anchor, tables);
-  recover_frame(frame, {transmission, width / 2}, width, height, layout, anchor, tables);
+  recover_with(frame, FromTables{tables});
 }
 
 }  // namespace
 
 void recover_frame(uint8_t* frame, CodeMap map, int width, int height, ChromaLayout layout,
-                   LightAnchor anchor, const RecoveryTables& tables) {
-  if (has_table_for_all(map, width / 2, height / 2))
-    recover_with(frame, map, width, height, layout, FromTables{tables});
+                   LightAnchor anchor, KeptTables* kept) {
+  const MappedFrame mapped = {frame, map, width, height, layout};
+  if (prefers_formula() || !has_table_for_all(mapped))
+    recover_with(mapped, FromFormula{anchor});
+  else if (kept != nullptr)
+    recover_with(mapped, FromTables{kept->for_anchor(anchor)});
   else
-    recover_with(frame, map, width, height, layout, FromFormula{anchor});
+    recover_with_new_tables(mapped, anchor);
 }
 
 }  // namespace haze::recover
 
+namespace {
+
+void recover_packed(uint8_t* frame, const uint8_t* transmission, const uint8_t* light_bgr,
+                    int width, int height, haze::recover::ChromaLayout layout) {
+  if (width < 2 || height < 2) return;
+  haze::recover::recover_frame(frame, {transmission, width / 2}, width, height, layout,
+                               haze::recover::light_anchor(light_bgr), nullptr);
+}
+
+}  // namespace
+
 void HazeRemoving3Preview_NV21(unsigned char* frame, unsigned char* transmission,
                                unsigned char* light, int width, int height, int /*recoverArg*/) {
-  haze::recover::recover_packed(frame, transmission, light, width, height,
-                                haze::recover::ChromaLayout::kInterleavedVu);
+  recover_packed(frame, transmission, light, width, height,
+                 haze::recover::ChromaLayout::kInterleavedVu);
 }
 
 void HazeRemoving3Preview(unsigned char* frame, unsigned char* transmission, unsigned char* light,
                           int width, int height, int /*recoverArg*/) {
-  haze::recover::recover_packed(frame, transmission, light, width, height,
-                                haze::recover::ChromaLayout::kPlanarUv);
+  recover_packed(frame, transmission, light, width, height, haze::recover::ChromaLayout::kPlanarUv);
 }

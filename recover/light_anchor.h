@@ -15,6 +15,13 @@ struct LightAnchor {
   }
 };
 
+// The same where fractions are kept.
+struct FloatAnchor {
+  float y;
+  float u;
+  float v;
+};
+
 // BT.601: Y = 0.587 G + 0.114 B + 0.299 R, U = 128 + 0.564 (B - Y), V = 128 + 0.713 (R - Y), in
 // double precision, each truncated to a byte.
 //

@@ -4,12 +4,14 @@
 #include "core/numeric.h"
 #include "haze_preview.h"
 #include "recover/block_indices.h"
+#include "recover/reciprocal_kernels.h"
 #include "recover/reciprocal_recovery.h"
 
 namespace {
 
 using haze::recover::BlockIndices;
 using haze::recover::IntegerRecovery;
+using haze::recover::recover_packed_rows_vectors;
 
 // Blocks [begin, end) of two rows. Chroma counts as subsampled vertically: the upper row's is used
 // for both, the lower row's is not read.
@@ -43,7 +45,9 @@ void HazeRemovingPreview(unsigned char* src, float* t, unsigned char* A, unsigne
     const float* const row = t + static_cast<ptrdiff_t>(y) * columns;
     const float* const next_row = y + 1 < rows ? row + columns : row;
     const ptrdiff_t offset = 2 * y * row_bytes;
-    for (int begin = 0; begin < columns; begin += BlockIndices::kBlocks) {
+    const int done = recover_packed_rows_vectors(src + offset, dst + offset, row_bytes, row,
+                                                 next_row, columns, recovery.float_anchor());
+    for (int begin = done; begin < columns; begin += BlockIndices::kBlocks) {
       const int end = haze::min(begin + BlockIndices::kBlocks, columns);
       haze::recover::fill_block_indices(row, next_row, begin, end, columns, indices);
       recover_row_pair(src + offset, dst + offset, row_bytes, begin, end, indices, recovery);

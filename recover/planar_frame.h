@@ -4,6 +4,8 @@
 #include <stddef.h>
 #include <stdint.h>
 
+#include "recover/block_row.h"
+
 namespace haze::recover {
 
 struct PlanarFrame {
@@ -23,6 +25,9 @@ struct PlanarFrame {
   }
   uint8_t* v_row(int block_y) const {
     return v + static_cast<ptrdiff_t>(block_y) * block_columns();
+  }
+  BlockRow row(int block_y) const {
+    return {luma_row(2 * block_y), luma_row(2 * block_y + 1), v_row(block_y), u_row(block_y)};
   }
   const float* transmission_row(int block_y) const {
     return transmission + static_cast<ptrdiff_t>(block_y) * block_columns();

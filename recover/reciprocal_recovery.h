@@ -18,7 +18,13 @@ inline uint8_t recover_by_index(int anchor, int sample, int index) {
 
 // How a member of the family recovers luma and chroma samples.
 struct IntegerRecovery {
+  static constexpr bool kInteger = true;
   LightAnchor anchor;
+
+  FloatAnchor float_anchor() const {
+    return {static_cast<float>(anchor.y), static_cast<float>(anchor.u),
+            static_cast<float>(anchor.v)};
+  }
 
   uint8_t luma(int sample, int index) const {
     return LutTablePreview[recover_by_index(anchor.y, sample, index)];
@@ -30,24 +36,30 @@ struct IntegerRecovery {
 // The same in single precision around an anchor that keeps its fraction.
 class FloatRecovery {
  public:
+  static constexpr bool kInteger = false;
+
   // BT.601 luma in double precision, then narrowed; chroma from the narrowed luma.
   explicit FloatRecovery(const uint8_t* light_bgr) {
     const double luma = light_bgr[1] * 0.587 + light_bgr[0] * 0.114 + light_bgr[2] * 0.299;
-    y_ = static_cast<float>(luma);
-    u_ = chroma(light_bgr[0], 0.564);
-    v_ = chroma(light_bgr[2], 0.713);
+    anchor_.y = static_cast<float>(luma);
+    anchor_.u = chroma(light_bgr[0], 0.564);
+    anchor_.v = chroma(light_bgr[2], 0.713);
     for (int index = 0; index < 256; ++index)
       factors_[index] = static_cast<float>(kReciprocals[index] * 0.00390625);
   }
 
-  uint8_t luma(int sample, int index) const { return LutTablePreview[recover(y_, sample, index)]; }
-  uint8_t u(int sample, int index) const { return recover(u_, sample, index); }
-  uint8_t v(int sample, int index) const { return recover(v_, sample, index); }
+  FloatAnchor float_anchor() const { return anchor_; }
+
+  uint8_t luma(int sample, int index) const {
+    return LutTablePreview[recover(anchor_.y, sample, index)];
+  }
+  uint8_t u(int sample, int index) const { return recover(anchor_.u, sample, index); }
+  uint8_t v(int sample, int index) const { return recover(anchor_.v, sample, index); }
 
  private:
   float chroma(uint8_t channel, double weight) const {
-    return static_cast<float>(128.0 +
-                              static_cast<double>(static_cast<float>(channel) - y_) * weight);
+    return static_cast<float>(128.0 + static_cast<double>(static_cast<float>(channel) - anchor_.y) *
+                                          weight);
   }
 
   uint8_t recover(float anchor, int sample, int index) const {
@@ -56,9 +68,7 @@ class FloatRecovery {
     return static_cast<uint8_t>(static_cast<int>(below_256 < 0.0f ? 0.0f : below_256));
   }
 
-  float y_;
-  float u_;
-  float v_;
+  FloatAnchor anchor_;
   float factors_[256];
 };
 

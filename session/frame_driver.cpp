@@ -66,7 +66,7 @@ void recover_cached(StreamState& stream, uint8_t* frame, int width, int height,
                     recover::ChromaLayout layout) {
   const recover::LightAnchor anchor = recover::light_anchor(stream.cached_light);
   recover::recover_frame(frame, {stream.cached_codes, kCacheRowBytes}, width, height, layout,
-                         anchor, stream.tables->for_anchor(anchor));
+                         anchor, stream.tables);
 }
 
 }  // namespace

@@ -1,0 +1,229 @@
+// 512-bit vectors under the names that the x86 kernels are written in. For source files compiled with
+// the flags of CpuLevel::kAvx512 only.
+#pragma once
+
+#include <immintrin.h>
+#include <stdint.h>
+
+namespace haze {
+
+struct Avx512 {
+  using Int = __m512i;
+  using Float = __m512;
+  static constexpr int kBytes = 64;
+  static constexpr int kFloats = 16;
+
+  static Int load(const void* from) { return _mm512_loadu_si512(from); }
+  static void store(void* to, Int a) { _mm512_storeu_si512(to, a); }
+  static void store_halves(void* low, void* high, Int a) {
+    _mm256_storeu_si256(static_cast<__m256i*>(low), _mm512_castsi512_si256(a));
+    _mm256_storeu_si256(static_cast<__m256i*>(high), _mm512_extracti64x4_epi64(a, 1));
+  }
+
+  static Int set8(int a) { return _mm512_set1_epi8(static_cast<char>(a)); }
+  static Int set16(int a) { return _mm512_set1_epi16(static_cast<short>(a)); }
+  static Int set32(int a) { return _mm512_set1_epi32(a); }
+  // Pairs of 16-bit values, `even` in the lower half of each 32 bits.
+  static Int set_pairs16(int even, int odd) {
+    return _mm512_set1_epi32((odd << 16) | (even & 0xFFFF));
+  }
+
+  static Int bit_and(Int a, Int b) { return _mm512_and_si512(a, b); }
+  static Int bit_xor(Int a, Int b) { return _mm512_xor_si512(a, b); }
+  static Int bit_or(Int a, Int b) { return _mm512_or_si512(a, b); }
+  static Int add16(Int a, Int b) { return _mm512_add_epi16(a, b); }
+  static Int add32(Int a, Int b) { return _mm512_add_epi32(a, b); }
+  static Int min16(Int a, Int b) { return _mm512_min_epi16(a, b); }
+  static Int max16(Int a, Int b) { return _mm512_max_epi16(a, b); }
+  static Int max8u(Int a, Int b) { return _mm512_max_epu8(a, b); }
+  // (a * b + 2^14) >> 15
+  static Int round_high_product16(Int a, Int b) { return _mm512_mulhrs_epi16(a, b); }
+  // Sums of the products of neighbouring 16-bit values, as 32 bits.
+  static Int sum_of_products16(Int a, Int b) { return _mm512_madd_epi16(a, b); }
+  template <int kBits>
+  static Int shift_left16(Int a) {
+    return _mm512_slli_epi16(a, kBits);
+  }
+  template <int kBits>
+  static Int shift_right16(Int a) {
+    return _mm512_srai_epi16(a, kBits);
+  }
+  template <int kBits>
+  static Int shift_right32(Int a) {
+    return _mm512_srai_epi32(a, kBits);
+  }
+
+  // Zero bytes below the bytes of `a`, and back from 32 to 16 bits. Both work within 128-bit lanes and
+  // cancel out.
+  static Int low_as_high_bytes(Int a) { return _mm512_unpacklo_epi8(_mm512_setzero_si512(), a); }
+  static Int high_as_high_bytes(Int a) { return _mm512_unpackhi_epi8(_mm512_setzero_si512(), a); }
+  static Int narrow32(Int low, Int high) { return _mm512_packs_epi32(low, high); }
+
+  // 16-bit values of two vectors as bytes, in order, clamped to 0 ... 255.
+  static Int clamp16(Int low, Int high) {
+    const Int order = _mm512_setr_epi64(0, 2, 4, 6, 1, 3, 5, 7);
+    return _mm512_permutexvar_epi64(order, _mm512_packus_epi16(low, high));
+  }
+  // 32-bit values of four vectors as bytes, in order, clamped to 0 ... 255. Values beyond 16 bits
+  // clamp as well.
+  static Int clamp32(const Int (&a)[4]) {
+    const Int order = _mm512_setr_epi32(0, 4, 8, 12, 1, 5, 9, 13, 2, 6, 10, 14, 3, 7, 11, 15);
+    return _mm512_permutexvar_epi32(
+        order, _mm512_packus_epi16(_mm512_packs_epi32(a[0], a[1]), _mm512_packs_epi32(a[2], a[3])));
+  }
+
+  // Bytes as 16-bit values; 16-bit values as 32-bit ones.
+  static Int load_bytes16(const uint8_t* from) {
+    return _mm512_cvtepu8_epi16(_mm256_loadu_si256(reinterpret_cast<const __m256i*>(from)));
+  }
+  static Int load32(const int16_t* from) {
+    return _mm512_cvtepi16_epi32(_mm256_loadu_si256(reinterpret_cast<const __m256i*>(from)));
+  }
+  static Int load32(const int32_t* from) { return load(from); }
+  static Int sub16(Int a, Int b) { return _mm512_sub_epi16(a, b); }
+  static Int sub32(Int a, Int b) { return _mm512_sub_epi32(a, b); }
+  // Each lane plus all lanes below it.
+  static Int running_sums32(Int a) {
+    const Int zero = _mm512_setzero_si512();
+    a = add32(a, _mm512_alignr_epi32(a, zero, 15));
+    a = add32(a, _mm512_alignr_epi32(a, zero, 14));
+    a = add32(a, _mm512_alignr_epi32(a, zero, 12));
+    return add32(a, _mm512_alignr_epi32(a, zero, 8));
+  }
+  static Int repeat_last32(Int a) { return _mm512_permutexvar_epi32(set32(15), a); }
+  static int first32(Int a) { return _mm_cvtsi128_si32(_mm512_castsi512_si128(a)); }
+  // The low bytes of 32-bit values.
+  static void store_low_bytes32(uint8_t* to, Int a) {
+    _mm_storeu_si128(reinterpret_cast<__m128i*>(to), _mm512_cvtepi32_epi8(a));
+  }
+
+  static Int min8u(Int a, Int b) { return _mm512_min_epu8(a, b); }
+  // Bytes of a and b in turn, a first, by 128-bit lanes; as 16-bit values with b = 0.
+  static Int interleave_low8(Int a, Int b) { return _mm512_unpacklo_epi8(a, b); }
+  static Int interleave_high8(Int a, Int b) { return _mm512_unpackhi_epi8(a, b); }
+  static Int interleave_low16(Int a, Int b) { return _mm512_unpacklo_epi16(a, b); }
+  static Int interleave_high16(Int a, Int b) { return _mm512_unpackhi_epi16(a, b); }
+  // 16-bit values as bytes clamped to 0 ... 255, by 128-bit lanes.
+  static Int clamp16_by_lanes(Int low, Int high) { return _mm512_packus_epi16(low, high); }
+
+  // kBytes pixels of three bytes as three vectors, and back.
+  static void load_three(const uint8_t* from, Int (&channels)[3]) {
+    const Int a = load(from);
+    const Int b = load(from + 64);
+    const Int c = load(from + 128);
+    for (int channel = 0; channel < 3; ++channel) {
+      const ByteOrder& order = kSplitOrder[channel];
+      channels[channel] = _mm512_permutex2var_epi8(
+          _mm512_permutex2var_epi8(a, load(order.first), b), load(order.second), c);
+    }
+  }
+  static void store_three(uint8_t* to, Int a, Int b, Int c) {
+    for (int part = 0; part < 3; ++part) {
+      const ByteOrder& order = kJoinOrder[part];
+      store(to + 64 * part,
+            _mm512_permutex2var_epi8(_mm512_permutex2var_epi8(a, load(order.first), b),
+                                     load(order.second), c));
+    }
+  }
+
+  static Float set_float(float a) { return _mm512_set1_ps(a); }
+  // a in even lanes, b in odd ones.
+  static Float set_alternating(float a, float b) {
+    return _mm512_castpd_ps(_mm512_set1_pd(_mm512_cvtsd_f64(
+        _mm512_castps_pd(_mm512_setr_ps(a, b, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0)))));
+  }
+  // kFloats bytes as floats.
+  static Float load_bytes(const uint8_t* from) {
+    return _mm512_cvtepi32_ps(
+        _mm512_cvtepu8_epi32(_mm_loadu_si128(reinterpret_cast<const __m128i*>(from))));
+  }
+  static Float load_floats(const float* from) { return _mm512_loadu_ps(from); }
+  // Lanes of a and b in turn, a first: the first half and the second half.
+  static Float interleave_low(Float a, Float b) {
+    return _mm512_permutex2var_ps(
+        a, _mm512_setr_epi32(0, 16, 1, 17, 2, 18, 3, 19, 4, 20, 5, 21, 6, 22, 7, 23), b);
+  }
+  static Float interleave_high(Float a, Float b) {
+    return _mm512_permutex2var_ps(
+        a, _mm512_setr_epi32(8, 24, 9, 25, 10, 26, 11, 27, 12, 28, 13, 29, 14, 30, 15, 31), b);
+  }
+  // Lanes 4 j ... 4 j + 3: a, a, b, a of lane j of the given quarter.
+  static Float spread_quarter(Float a, Float b, int quarter) {
+    const Int order = add32(_mm512_setr_epi32(0, 0, 16, 0, 1, 1, 17, 1, 2, 2, 18, 2, 3, 3, 19, 3),
+                            set32(4 * quarter));
+    return _mm512_permutex2var_ps(a, order, b);
+  }
+  static Float set_four(float a, float b, float c, float d) { return _mm512_setr4_ps(a, b, c, d); }
+  static Float add(Float a, Float b) { return _mm512_add_ps(a, b); }
+  static Float sub(Float a, Float b) { return _mm512_sub_ps(a, b); }
+  static Float mul(Float a, Float b) { return _mm512_mul_ps(a, b); }
+  static Float div(Float a, Float b) { return _mm512_div_ps(a, b); }
+  // a < b ? a : b and a > b ? a : b; b where either is not a number.
+  static Float min(Float a, Float b) { return _mm512_min_ps(a, b); }
+  static Float max(Float a, Float b) { return _mm512_max_ps(a, b); }
+  static Float to_float(Int a) { return _mm512_cvtepi32_ps(a); }
+  // Truncated; what is not a number becomes the least integer.
+  static Int truncate(Float a) { return _mm512_cvttps_epi32(a); }
+  // The lower or the upper half of the lanes, each twice.
+  static Float repeat_low(Float a) {
+    return _mm512_permutexvar_ps(_mm512_setr_epi32(0, 0, 1, 1, 2, 2, 3, 3, 4, 4, 5, 5, 6, 6, 7, 7),
+                                 a);
+  }
+  static Float repeat_high(Float a) {
+    return _mm512_permutexvar_ps(
+        _mm512_setr_epi32(8, 8, 9, 9, 10, 10, 11, 11, 12, 12, 13, 13, 14, 14, 15, 15), a);
+  }
+
+  // A table of 256 bytes in registers.
+  struct Table {
+    explicit Table(const uint8_t* bytes)
+        : a(load(bytes)), b(load(bytes + 64)), c(load(bytes + 128)), d(load(bytes + 192)) {}
+
+    Int operator[](Int index) const {
+      return _mm512_mask_blend_epi8(_mm512_movepi8_mask(index),
+                                    _mm512_permutex2var_epi8(a, index, b),
+                                    _mm512_permutex2var_epi8(c, index, d));
+    }
+
+    Int a, b, c, d;
+  };
+
+ private:
+  // Indices for two byte permutations: the first takes from two vectors, the second from its result
+  // (0 ... 63) and a third vector (64 ... 127).
+  struct ByteOrder {
+    uint8_t first[64];
+    uint8_t second[64];
+  };
+
+  // Byte i of a channel is byte 3 i + channel of 192.
+  static constexpr ByteOrder split_order(int channel) {
+    ByteOrder order = {};
+    for (int i = 0; i < 64; ++i) {
+      const int source = 3 * i + channel;
+      order.first[i] = static_cast<uint8_t>(source % 128);
+      order.second[i] = static_cast<uint8_t>(source < 128 ? i : source - 64);
+    }
+    return order;
+  }
+  // Byte i of a part is byte (64 part + i) / 3 of channel (64 part + i) % 3.
+  static constexpr ByteOrder join_order(int part) {
+    ByteOrder order = {};
+    for (int i = 0; i < 64; ++i) {
+      const int pixel = (64 * part + i) / 3;
+      const int channel = (64 * part + i) % 3;
+      order.first[i] = static_cast<uint8_t>(channel == 1 ? 64 + pixel : pixel);
+      order.second[i] = static_cast<uint8_t>(channel == 2 ? 64 + pixel : i);
+    }
+    return order;
+  }
+  static const ByteOrder kSplitOrder[3];
+  static const ByteOrder kJoinOrder[3];
+};
+
+inline constexpr Avx512::ByteOrder Avx512::kSplitOrder[3] = {split_order(0), split_order(1),
+                                                             split_order(2)};
+inline constexpr Avx512::ByteOrder Avx512::kJoinOrder[3] = {join_order(0), join_order(1),
+                                                            join_order(2)};
+
+}  // namespace haze
