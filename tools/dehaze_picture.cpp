@@ -1,0 +1,68 @@
+#include "dehaze_picture.h"
+
+#include "errors.h"
+#include "frame_path.h"
+#include "interrupt.h"
+#include "media/av_error.h"
+#include "media/color_convert.h"
+#include "media/filter_pipe.h"
+#include "media/orientation.h"
+#include "media/transparency.h"
+#include "media/writer_picture.h"
+#include "output_file.h"
+
+namespace dehaze {
+namespace {
+
+Orientation orientation_of(const Reader& reader, const AVFrame& frame) {
+  const int32_t* matrix = display_matrix(reader.video());
+  return matrix != nullptr ? orientation_of_matrix(matrix) : orientation_of_picture(frame);
+}
+
+void copy_icc_profile(const AVFrame& from, AVFrame* to, OutputKind kind, Console& console) {
+  const AVFrameSideData* profile = av_frame_get_side_data(&from, AV_FRAME_DATA_ICC_PROFILE);
+  if (profile == nullptr) return;
+  // The encoder leaves it out.
+  if (kind == OutputKind::kWebp) console.note("the colour profile is lost in WebP; PNG keeps it");
+  AVFrameSideData* copy =
+      av_frame_new_side_data_from_buf(to, profile->type, av_buffer_ref(profile->buf));
+  if (copy == nullptr) throw std::bad_alloc();
+}
+
+}  // namespace
+
+FrameTimes dehaze_picture(Reader& reader, const Options& options, Console& console) {
+  const FramePtr frame = make_frame();
+  if (!reader.read_frame(frame.get())) throw Error(reader.path() + ": holds no picture");
+
+  const Orientation orientation = orientation_of(reader, *frame);
+  FramePath path(*frame, reader.is_picture(), options.level, console);
+  const FrameSize& size = path.size();
+  const Nv21Frame& nv21 = path.run(*frame);
+
+  OutputSamples samples = picture_samples(options.output_kind, path.siting());
+  // Turning a 4:2:0 picture of an odd size would put its chroma half a sample off.
+  if (samples.format == AV_PIX_FMT_YUVJ420P && size.is_padded() && !orientation.is_upright()) {
+    samples.format = AV_PIX_FMT_YUVJ444P;
+  }
+  FramePtr picture =
+      FromNv21(size.visible_width, size.visible_height, path.siting(), samples).convert(nv21);
+
+  const FramePtr alpha = take_alpha(*frame, size.visible_width, size.visible_height);
+  if (alpha && options.output_kind == OutputKind::kJpeg) {
+    console.note("JPEG has no transparency; it is left out");
+  } else if (alpha) {
+    picture = with_alpha(*picture, *alpha);
+  }
+  if (!orientation.is_upright()) picture = run_filter(*picture, orientation.filter());
+  copy_icc_profile(*frame, picture.get(), options.output_kind, console);
+
+  throw_if_interrupted();
+  OutputFile file(options.output, options.force);
+  write_picture(*picture, options.output_kind, file.temporary_path());
+  throw_if_interrupted();
+  file.commit();
+  return path.times();
+}
+
+}  // namespace dehaze

@@ -1,0 +1,18 @@
+// One picture in, one picture out.
+#ifndef TOOLS_DEHAZE_PICTURE_H
+#define TOOLS_DEHAZE_PICTURE_H
+
+#include "console.h"
+#include "haze_session.h"
+#include "media/reader.h"
+#include "options.h"
+
+namespace dehaze {
+
+// Of a video the first frame is taken. The picture comes out upright and without an orientation
+// tag. A single frame is always an estimate frame.
+FrameTimes dehaze_picture(Reader& reader, const Options& options, Console& console);
+
+}  // namespace dehaze
+
+#endif  // TOOLS_DEHAZE_PICTURE_H

@@ -1,0 +1,114 @@
+#include "dehaze_video.h"
+
+#include <algorithm>
+#include <limits>
+#include <optional>
+#include <string>
+#include <utility>
+
+#include "errors.h"
+#include "frame_path.h"
+#include "interrupt.h"
+#include "media/color_convert.h"
+#include "media/filter_pipe.h"
+#include "media/orientation.h"
+#include "media/writer_video.h"
+#include "output_file.h"
+#include "progress.h"
+
+namespace dehaze {
+namespace {
+
+void note_what_is_lost(const Reader& reader, const FrameSize& size, OutputKind kind,
+                       Console& console) {
+  if (kind != OutputKind::kY4m) {
+    if (size.is_padded()) {
+      console.note("H.264 needs an even size; the last column or row is repeated, giving " +
+                   std::to_string(size.padded_width()) + " x " +
+                   std::to_string(size.padded_height()));
+    }
+    return;
+  }
+  if (!reader.audio().empty()) console.note("Y4M holds no audio; it is left out");
+  if (!reader.has_constant_rate()) {
+    console.note("Y4M holds no time stamps; all frames become equally long");
+  }
+}
+
+// By which the pixels have to be turned, because the output cannot tell the player to do it.
+Orientation turn_for(const Reader& reader, OutputKind kind) {
+  const int32_t* matrix = display_matrix(reader.video());
+  return matrix == nullptr || stores_rotation(kind) ? Orientation() : orientation_of_matrix(matrix);
+}
+
+VideoFormat format_before_turn(const Reader& reader, const AVFrame& first, const FramePath& path,
+                               OutputKind kind) {
+  const FrameSize& size = path.size();
+  const bool even_only = kind != OutputKind::kY4m;
+  VideoFormat format = video_format_like(first, path.siting());
+  format.width = even_only ? size.padded_width() : size.visible_width;
+  format.height = even_only ? size.padded_height() : size.visible_height;
+  format.sample_aspect_ratio = reader.sample_aspect_ratio(first);
+  return format;
+}
+
+VideoFormat turned(VideoFormat format, const Orientation& turn) {
+  if (turn.transposed) {
+    std::swap(format.width, format.height);
+    if (format.sample_aspect_ratio.num > 0) {
+      std::swap(format.sample_aspect_ratio.num, format.sample_aspect_ratio.den);
+    }
+  }
+  return format;
+}
+
+}  // namespace
+
+FrameTimes dehaze_video(Reader& reader, const Options& options, Console& console) {
+  const OutputKind kind = options.output_kind;
+  const FramePtr input = make_frame();
+  if (!reader.read_frame(input.get())) throw Error(reader.path() + ": holds no video");
+
+  FramePath path(*input, false, options.level, console);
+  note_what_is_lost(reader, path.size(), kind, console);
+  const Orientation turn = turn_for(reader, kind);
+  const VideoFormat format = format_before_turn(reader, *input, path, kind);
+  FromNv21 from_nv21(format.width, format.height, path.siting(), format.samples);
+  std::optional<FilterPipe> turner;
+
+  std::optional<OutputFile> file;
+  if (options.output != "-") file.emplace(options.output, options.force);
+  // Declared after the file, so that it is closed before the file is removed.
+  VideoWriter writer(kind, file ? file->temporary_path() : options.output, reader,
+                     turned(format, turn));
+
+  const int64_t limit =
+      options.max_frames > 0 ? options.max_frames : std::numeric_limits<int64_t>::max();
+  const int64_t expected = reader.frame_count();
+  Progress progress(console, expected > 0 || options.max_frames > 0
+                                 ? std::min(limit, expected > 0 ? expected : limit)
+                                 : 0);
+  int64_t frames = 0;
+  do {
+    FramePtr output = from_nv21.convert(path.run(*input));
+    if (!turn.is_upright()) {
+      if (!turner) turner.emplace(*output, turn.filter());
+      output = turner->run(*output);
+    }
+    output->pts = input->pts;
+    writer.write(*output, input->pkt_duration, reader.pending_audio());
+    progress.advance();
+  } while (++frames < limit && reader.read_frame(input.get()));
+
+  int64_t audio_end = std::numeric_limits<int64_t>::max();
+  if (frames == limit) {
+    audio_end = writer.end();
+    if (kind != OutputKind::kY4m) reader.read_audio_until(audio_end);
+  }
+  writer.finish(reader.pending_audio(), audio_end);
+  throw_if_interrupted();
+  if (file) file->commit();
+  return path.times();
+}
+
+}  // namespace dehaze

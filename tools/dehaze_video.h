@@ -1,0 +1,16 @@
+// Video in, video out.
+#ifndef TOOLS_DEHAZE_VIDEO_H
+#define TOOLS_DEHAZE_VIDEO_H
+
+#include "console.h"
+#include "haze_session.h"
+#include "media/reader.h"
+#include "options.h"
+
+namespace dehaze {
+
+FrameTimes dehaze_video(Reader& reader, const Options& options, Console& console);
+
+}  // namespace dehaze
+
+#endif  // TOOLS_DEHAZE_VIDEO_H

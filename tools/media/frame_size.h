@@ -1,0 +1,32 @@
+// Which part of an input frame reaches the library at which size.
+#ifndef TOOLS_MEDIA_FRAME_SIZE_H
+#define TOOLS_MEDIA_FRAME_SIZE_H
+
+namespace dehaze {
+
+// Limits of the library's frame path.
+constexpr int kMaxFrameWidth = 1280;
+constexpr int kMaxFrameHeight = 720;
+constexpr int kMinFrameSide = 128;
+
+struct FrameSize {
+  int source_width;
+  int source_height;
+  int visible_width;  // after scaling down; may be odd if nothing was scaled
+  int visible_height;
+
+  int padded_width() const { return visible_width + visible_width % 2; }
+  int padded_height() const { return visible_height + visible_height % 2; }
+  bool is_scaled() const {
+    return visible_width != source_width || visible_height != source_height;
+  }
+  bool is_padded() const { return visible_width % 2 != 0 || visible_height % 2 != 0; }
+};
+
+// Larger frames are scaled down to fit, keeping their shape to the nearest even size. Throws Error
+// for frames that are too small, also those that are so only after scaling.
+FrameSize fit_frame_size(int width, int height);
+
+}  // namespace dehaze
+
+#endif  // TOOLS_MEDIA_FRAME_SIZE_H

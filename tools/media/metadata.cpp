@@ -1,0 +1,43 @@
+#include "media/metadata.h"
+
+#include <algorithm>
+#include <array>
+#include <string_view>
+
+namespace dehaze {
+namespace {
+
+bool begins_with(std::string_view text, std::string_view start) {
+  return text.substr(0, start.size()) == start;
+}
+
+// Brands of the MP4 family, the encoder's name, rotation (which has a field of its own), and the
+// statistics that MKV writers add ("BPS-eng", "_STATISTICS_TAGS").
+bool describes_old_file(std::string_view key) {
+  constexpr std::array<std::string_view, 6> kKeys = {
+      "major_brand", "minor_version", "compatible_brands", "encoder", "rotate", "vendor_id"};
+  constexpr std::array<std::string_view, 5> kPrefixes = {"BPS", "DURATION", "NUMBER_OF_", "ENCODER",
+                                                         "_STATISTICS"};
+  return std::find(kKeys.begin(), kKeys.end(), key) != kKeys.end() ||
+         std::any_of(kPrefixes.begin(), kPrefixes.end(),
+                     [&](std::string_view prefix) { return begins_with(key, prefix); });
+}
+
+void copy_metadata(const AVDictionary* from, AVDictionary** to) {
+  const AVDictionaryEntry* entry = nullptr;
+  while ((entry = av_dict_get(from, "", entry, AV_DICT_IGNORE_SUFFIX)) != nullptr) {
+    if (!describes_old_file(entry->key)) av_dict_set(to, entry->key, entry->value, 0);
+  }
+}
+
+}  // namespace
+
+void copy_container_metadata(const AVFormatContext& from, AVFormatContext& to) {
+  copy_metadata(from.metadata, &to.metadata);
+}
+
+void copy_stream_metadata(const AVStream& from, AVStream& to) {
+  copy_metadata(from.metadata, &to.metadata);
+}
+
+}  // namespace dehaze

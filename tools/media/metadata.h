@@ -1,0 +1,15 @@
+// Titles, dates, languages and the like, from one container to another.
+#ifndef TOOLS_MEDIA_METADATA_H
+#define TOOLS_MEDIA_METADATA_H
+
+#include "media/ffmpeg_handles.h"
+
+namespace dehaze {
+
+// Both leave out what describes the old file rather than its content.
+void copy_container_metadata(const AVFormatContext& from, AVFormatContext& to);
+void copy_stream_metadata(const AVStream& from, AVStream& to);
+
+}  // namespace dehaze
+
+#endif  // TOOLS_MEDIA_METADATA_H

@@ -1,0 +1,96 @@
+#include "media/writer_picture.h"
+
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+
+#include "errors.h"
+#include "media/av_error.h"
+
+namespace dehaze {
+namespace {
+
+// Both give about 44 dB against the PNG output for photographs.
+constexpr int kJpegQuantizer = 2;
+constexpr const char* kWebpQuality = "92";
+
+const char* encoder_name(OutputKind kind) {
+  switch (kind) {
+    case OutputKind::kJpeg:
+      return "mjpeg";
+    case OutputKind::kPng:
+      return "png";
+    case OutputKind::kWebp:
+      return "libwebp";
+    default:
+      throw Error("internal error: not a kind of picture");
+  }
+}
+
+EncoderPtr open_encoder(const AVFrame& frame, OutputKind kind) {
+  const AVCodec* codec = avcodec_find_encoder_by_name(encoder_name(kind));
+  if (codec == nullptr) {
+    throw Error(std::string("FFmpeg was built without the encoder ") + encoder_name(kind));
+  }
+  EncoderPtr encoder(avcodec_alloc_context3(codec));
+  if (!encoder) throw std::bad_alloc();
+  encoder->width = frame.width;
+  encoder->height = frame.height;
+  encoder->pix_fmt = static_cast<AVPixelFormat>(frame.format);
+  encoder->color_range = frame.color_range;
+  encoder->colorspace = frame.colorspace;
+  encoder->time_base = AVRational{1, 25};  // has to be set, means nothing for one picture
+  Dictionary options;
+  if (kind == OutputKind::kJpeg) {
+    encoder->flags |= AV_CODEC_FLAG_QSCALE;
+    encoder->global_quality = kJpegQuantizer * FF_QP2LAMBDA;
+  } else if (kind == OutputKind::kPng) {
+    options.set("pred", "mixed");
+  } else {
+    options.set("quality", kWebpQuality);
+  }
+  check(avcodec_open2(encoder.get(), codec, options.address()),
+        std::string("cannot set up the encoder ") + codec->name);
+  return encoder;
+}
+
+struct CloseFile {
+  void operator()(std::FILE* file) const { std::fclose(file); }
+};
+
+void write_file(const AVPacket& packet, const std::string& path) {
+  std::unique_ptr<std::FILE, CloseFile> file(std::fopen(path.c_str(), "wb"));
+  const size_t size = static_cast<size_t>(packet.size);
+  bool written = file && std::fwrite(packet.data, 1, size, file.get()) == size;
+  if (file) written = std::fclose(file.release()) == 0 && written;
+  if (!written) throw Error(std::string("cannot write the picture: ") + std::strerror(errno));
+}
+
+}  // namespace
+
+OutputSamples picture_samples(OutputKind kind, AVChromaLocation siting) {
+  switch (kind) {
+    case OutputKind::kJpeg:
+      return {AV_PIX_FMT_YUVJ420P, {AVCOL_RANGE_JPEG, AVCOL_SPC_SMPTE170M, siting}};
+    case OutputKind::kWebp:
+      return {AV_PIX_FMT_YUV420P, {AVCOL_RANGE_MPEG, AVCOL_SPC_SMPTE170M, siting}};
+    default:
+      return {AV_PIX_FMT_RGB24, {AVCOL_RANGE_JPEG, AVCOL_SPC_RGB, siting}};
+  }
+}
+
+void write_picture(const AVFrame& frame, OutputKind kind, const std::string& path) {
+  const EncoderPtr encoder = open_encoder(frame, kind);
+  FramePtr input = make_frame();
+  check(av_frame_ref(input.get(), &frame), "cannot allocate a frame");
+  input->pts = 0;
+  input->quality = encoder->global_quality;
+  const char* const what = "cannot encode the picture";
+  check(avcodec_send_frame(encoder.get(), input.get()), what);
+  check(avcodec_send_frame(encoder.get(), nullptr), what);
+  PacketPtr packet = make_packet();
+  check(avcodec_receive_packet(encoder.get(), packet.get()), what);
+  write_file(*packet, path);
+}
+
+}  // namespace dehaze

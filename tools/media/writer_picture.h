@@ -1,0 +1,23 @@
+// Output: one picture as a JPEG, PNG or WebP file.
+#ifndef TOOLS_MEDIA_WRITER_PICTURE_H
+#define TOOLS_MEDIA_WRITER_PICTURE_H
+
+#include <string>
+
+#include "media/color_convert.h"
+#include "media/ffmpeg_handles.h"
+#include "options.h"
+
+namespace dehaze {
+
+// What a picture file of that kind is made from: 4:2:0 for JPEG and WebP, so that the recovered
+// chroma is stored as it is, and RGB for PNG. `siting` is that of the NV21 frame.
+OutputSamples picture_samples(OutputKind kind, AVChromaLocation siting);
+
+// Encodes the frame and writes it to `path`, which exists already; an ICC profile among its side
+// data is embedded in JPEG and PNG.
+void write_picture(const AVFrame& frame, OutputKind kind, const std::string& path);
+
+}  // namespace dehaze
+
+#endif  // TOOLS_MEDIA_WRITER_PICTURE_H

@@ -1,0 +1,276 @@
+#include "media/writer_video.h"
+
+extern "C" {
+#include <libavutil/avutil.h>
+}
+
+#include <algorithm>
+#include <cstring>
+
+#include "errors.h"
+#include "interrupt.h"
+#include "media/av_error.h"
+#include "media/metadata.h"
+#include "media/orientation.h"
+
+namespace dehaze {
+namespace {
+
+// Visually close to the input; the haze removal brings out texture that would cost a smaller file
+// its detail first.
+constexpr const char* kQuality = "18";
+constexpr const char* kSpeed = "fast";
+constexpr AVRational kUsualFrameRate = {25, 1};  // where a Y4M header needs one and none is known
+
+const char* container_name(OutputKind kind) {
+  switch (kind) {
+    case OutputKind::kMp4:
+      return "mp4";
+    case OutputKind::kMov:
+      return "mov";
+    case OutputKind::kMkv:
+      return "matroska";
+    case OutputKind::kY4m:
+      return "yuv4mpegpipe";
+    default:
+      throw Error("internal error: not a kind of video");
+  }
+}
+
+int stop_on_signal(void*) { return pending_signal() != 0; }
+
+void copy_display_matrix(const AVStream& from, AVStream* to) {
+  const int32_t* matrix = display_matrix(from);
+  if (matrix == nullptr) return;
+  constexpr size_t kBytes = 9 * sizeof(int32_t);
+  uint8_t* copy = av_stream_new_side_data(to, AV_PKT_DATA_DISPLAYMATRIX, kBytes);
+  if (copy == nullptr) throw std::bad_alloc();
+  std::memcpy(copy, matrix, kBytes);
+}
+
+}  // namespace
+
+VideoFormat video_format_like(const AVFrame& frame, AVChromaLocation siting) {
+  SampleMeaning meaning = meaning_of(frame, false);
+  VideoFormat format = {};
+  format.width = frame.width;
+  format.height = frame.height;
+  format.primaries = frame.color_primaries;
+  format.transfer = frame.color_trc;
+  format.sample_aspect_ratio = frame.sample_aspect_ratio;
+  if (meaning.matrix == AVCOL_SPC_RGB) {
+    meaning = {AVCOL_RANGE_MPEG, guessed_video_matrix(frame.width, frame.height), siting};
+    format.range = meaning.range;
+    format.matrix = meaning.matrix;
+  } else {
+    // Missing tags stay missing, except that full range is always said: players assume limited.
+    format.range = meaning.range == AVCOL_RANGE_JPEG ? AVCOL_RANGE_JPEG : frame.color_range;
+    format.matrix = frame.colorspace;
+  }
+  meaning.siting = siting;
+  format.samples = {AV_PIX_FMT_YUV420P, meaning};
+  return format;
+}
+
+// The MKV muxer of FFmpeg 5.1 leaves rotation out, and Y4M has no place for it.
+bool stores_rotation(OutputKind kind) {
+  return kind == OutputKind::kMp4 || kind == OutputKind::kMov;
+}
+
+VideoWriter::VideoWriter(OutputKind kind, const std::string& path, const Reader& reader,
+                         const VideoFormat& format)
+    : is_y4m_(kind == OutputKind::kY4m),
+      has_constant_rate_(reader.has_constant_rate()),
+      frame_rate_(reader.frame_rate()),
+      input_base_(reader.video().time_base) {
+  // Where no time stamps can be written, the average keeps the length of the video.
+  const AVRational average = reader.video().avg_frame_rate;
+  if (is_y4m_ && !has_constant_rate_ && average.num > 0) frame_rate_ = average;
+  if (frame_rate_.num <= 0 || frame_rate_.den <= 0) frame_rate_ = kUsualFrameRate;
+  frame_length_ = std::max<int64_t>(av_rescale_q(1, av_inv_q(frame_rate_), input_base_), 1);
+  const int64_t start = reader.container().start_time;
+  if (start != AV_NOPTS_VALUE) start_ = std::max<int64_t>(start, 0);
+
+  AVFormatContext* container = nullptr;
+  const std::string url = path == "-" ? "pipe:1" : "file:" + path;
+  check(avformat_alloc_output_context2(&container, nullptr, container_name(kind), url.c_str()),
+        "cannot set up the output");
+  container_.reset(container);
+  open_encoder(format);
+  add_video_stream(reader);
+  if (stores_rotation(kind)) copy_display_matrix(reader.video(), video_);
+  if (!is_y4m_) add_audio_streams(reader);
+  copy_container_metadata(reader.container(), *container_);
+  open_file(url);
+}
+
+void VideoWriter::open_encoder(const VideoFormat& format) {
+  const char* const name = is_y4m_ ? "wrapped_avframe" : "libx264";
+  const AVCodec* codec = avcodec_find_encoder_by_name(name);
+  if (codec == nullptr) {
+    throw Error(std::string("FFmpeg was built without the encoder ") + name);
+  }
+  encoder_.reset(avcodec_alloc_context3(codec));
+  if (!encoder_) throw std::bad_alloc();
+  encoder_->width = format.width;
+  encoder_->height = format.height;
+  encoder_->pix_fmt = format.samples.format;
+  encoder_->color_range = format.range;
+  encoder_->colorspace = format.matrix;
+  encoder_->color_primaries = format.primaries;
+  encoder_->color_trc = format.transfer;
+  encoder_->chroma_sample_location = format.samples.meaning.siting;
+  encoder_->sample_aspect_ratio = format.sample_aspect_ratio;
+  encoder_->framerate = frame_rate_;
+  encoder_->time_base = is_y4m_ ? av_inv_q(frame_rate_) : input_base_;
+  encoder_->field_order = AV_FIELD_PROGRESSIVE;
+  if (container_->oformat->flags & AVFMT_GLOBALHEADER) {
+    encoder_->flags |= AV_CODEC_FLAG_GLOBAL_HEADER;
+  }
+  Dictionary options;
+  if (!is_y4m_) {
+    options.set("crf", kQuality);
+    options.set("preset", kSpeed);
+    // Writes the frame rate into the stream instead of the tick of the time stamps. The time stamps
+    // themselves stay as they are.
+    if (has_constant_rate_) options.set("x264-params", "force-cfr=1");
+  }
+  check(avcodec_open2(encoder_.get(), codec, options.address()),
+        std::string("cannot set up the encoder ") + name);
+}
+
+void VideoWriter::add_video_stream(const Reader& reader) {
+  video_ = avformat_new_stream(container_.get(), nullptr);
+  if (video_ == nullptr) throw std::bad_alloc();
+  check(avcodec_parameters_from_context(video_->codecpar, encoder_.get()),
+        "cannot set up the output");
+  video_->time_base = encoder_->time_base;
+  video_->sample_aspect_ratio = encoder_->sample_aspect_ratio;
+  video_->avg_frame_rate = is_y4m_ ? frame_rate_ : reader.video().avg_frame_rate;
+  video_->r_frame_rate = is_y4m_ ? frame_rate_ : reader.video().r_frame_rate;
+  video_->disposition = reader.video().disposition;
+  copy_stream_metadata(reader.video(), *video_);
+}
+
+void VideoWriter::add_audio_streams(const Reader& reader) {
+  for (const AVStream* input : reader.audio()) {
+    const AVCodecParameters& codec = *input->codecpar;
+    if (avformat_query_codec(container_->oformat, codec.codec_id, FF_COMPLIANCE_NORMAL) != 1) {
+      throw Error(std::string("this kind of output cannot hold ") +
+                  avcodec_get_name(codec.codec_id) + " audio; use .mkv");
+    }
+    AVStream* output = avformat_new_stream(container_.get(), nullptr);
+    if (output == nullptr) throw std::bad_alloc();
+    check(avcodec_parameters_copy(output->codecpar, &codec), "cannot copy the audio");
+    output->codecpar->codec_tag = 0;  // the containers have codes of their own
+    output->time_base = input->time_base;
+    output->disposition = input->disposition;
+    copy_stream_metadata(*input, *output);
+    audio_[input->index] = {input->time_base, output};
+  }
+}
+
+void VideoWriter::open_file(const std::string& url) {
+  const AVIOInterruptCB interrupt = {stop_on_signal, nullptr};
+  container_->interrupt_callback = interrupt;
+  check(avio_open2(&container_->pb, url.c_str(), AVIO_FLAG_WRITE, &interrupt, nullptr),
+        "cannot open the output");
+  Dictionary options;
+  // The index goes in front, so that players can start before they have the whole file. Containers
+  // that do not know the option leave it in the dictionary.
+  options.set("movflags", "+faststart");
+  // Whoever reads the pipe gets each frame as soon as it is ready.
+  if (url == "pipe:1") container_->flags |= AVFMT_FLAG_FLUSH_PACKETS;
+  check(avformat_write_header(container_.get(), options.address()), "cannot write the output");
+}
+
+// Time stamps of the output never stand still or go back, whatever the input does.
+int64_t VideoWriter::place_in_time(int64_t pts, int64_t duration) {
+  if (pts == AV_NOPTS_VALUE) {
+    pts = frames_ == 0 ? av_rescale_q(start_, AV_TIME_BASE_Q, input_base_)
+                       : last_pts_ + last_duration_;
+  }
+  if (frames_ > 0) pts = std::max(pts, last_pts_ + 1);
+  last_pts_ = pts;
+  last_duration_ = duration > 0 ? duration : frame_length_;
+  return pts;
+}
+
+void VideoWriter::write(AVFrame& frame, int64_t duration, std::deque<PacketPtr>& audio) {
+  const int64_t before = last_pts_;
+  const int64_t pts = place_in_time(frame.pts, duration);
+  write_audio_before(av_rescale_q(pts, input_base_, AV_TIME_BASE_Q), audio);
+  if (is_y4m_) {
+    frame.pts = frames_;
+  } else {
+    const int64_t shift = av_rescale_q(start_, AV_TIME_BASE_Q, input_base_);
+    frame.pts = pts - shift;
+    if (frames_ > 0) durations_[before - shift] = pts - before;
+    durations_[frame.pts] = last_duration_;
+  }
+  ++frames_;
+  frame.pict_type = AV_PICTURE_TYPE_NONE;
+  encode(&frame);
+}
+
+int64_t VideoWriter::end() const {
+  return av_rescale_q(last_pts_ + last_duration_, input_base_, AV_TIME_BASE_Q);
+}
+
+void VideoWriter::encode(const AVFrame* frame) {
+  check(avcodec_send_frame(encoder_.get(), frame), "cannot encode a frame");
+  for (;;) {
+    throw_if_interrupted();
+    const int result = avcodec_receive_packet(encoder_.get(), packet_.get());
+    if (result == AVERROR(EAGAIN) || result == AVERROR_EOF) return;
+    check(result, "cannot encode a frame");
+    if (is_y4m_) {
+      packet_->duration = 1;
+    } else if (const auto known = durations_.find(packet_->pts); known != durations_.end()) {
+      packet_->duration = known->second;
+      durations_.erase(known);
+    }
+    packet_->stream_index = video_->index;
+    av_packet_rescale_ts(packet_.get(), encoder_->time_base, video_->time_base);
+    write_packet(*packet_);
+  }
+}
+
+void VideoWriter::write_packet(AVPacket& packet) {
+  const char* const what = "cannot write the output";
+  check(av_interleaved_write_frame(container_.get(), &packet), what);
+  // Errors of buffered writes show up here.
+  if (container_->pb->error < 0) check(container_->pb->error, what);
+}
+
+void VideoWriter::write_audio_before(int64_t end, std::deque<PacketPtr>& audio) {
+  std::deque<PacketPtr> later;
+  for (PacketPtr& packet : audio) {
+    const auto track = audio_.find(packet->stream_index);
+    if (track == audio_.end()) continue;
+    const AVRational input_base = track->second.input_base;
+    const int64_t begin = packet->pts != AV_NOPTS_VALUE ? packet->pts : packet->dts;
+    if (begin != AV_NOPTS_VALUE && av_compare_ts(begin, input_base, end, AV_TIME_BASE_Q) >= 0) {
+      later.push_back(std::move(packet));
+      continue;
+    }
+    const int64_t shift = av_rescale_q(start_, AV_TIME_BASE_Q, input_base);
+    if (packet->pts != AV_NOPTS_VALUE) packet->pts -= shift;
+    if (packet->dts != AV_NOPTS_VALUE) packet->dts -= shift;
+    av_packet_rescale_ts(packet.get(), input_base, track->second.output->time_base);
+    packet->stream_index = track->second.output->index;
+    packet->pos = -1;
+    write_packet(*packet);
+  }
+  audio.swap(later);
+}
+
+void VideoWriter::finish(std::deque<PacketPtr>& audio, int64_t audio_end) {
+  write_audio_before(audio_end, audio);
+  encode(nullptr);
+  const char* const what = "cannot complete the output";
+  check(av_write_trailer(container_.get()), what);
+  check(avio_closep(&container_->pb), what);
+}
+
+}  // namespace dehaze

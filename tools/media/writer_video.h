@@ -1,0 +1,87 @@
+// Output: H.264 in MP4, MOV or MKV with copied audio, or Y4M as a file or on a pipe.
+#ifndef TOOLS_MEDIA_WRITER_VIDEO_H
+#define TOOLS_MEDIA_WRITER_VIDEO_H
+
+#include <cstdint>
+#include <deque>
+#include <map>
+#include <string>
+
+#include "media/color_convert.h"
+#include "media/ffmpeg_handles.h"
+#include "media/reader.h"
+#include "options.h"
+
+namespace dehaze {
+
+// Everything about the frames that a video file states in its header.
+struct VideoFormat {
+  int width;
+  int height;
+  OutputSamples samples;  // what the values are
+  AVColorRange range;     // what the file says they are: the input's tags, which may be
+  AVColorSpace matrix;    // missing
+  AVColorPrimaries primaries;
+  AVColorTransferCharacteristic transfer;
+  AVRational sample_aspect_ratio;  // 0/1 if unknown
+};
+
+// 4:2:0 in the range, matrix and tags of the input. The size and aspect ratio are the caller's.
+VideoFormat video_format_like(const AVFrame& first_frame, AVChromaLocation siting);
+
+// True if the container can say that a player has to turn the picture; for the others the pixels
+// have to be turned.
+bool stores_rotation(OutputKind kind);
+
+class VideoWriter {
+ public:
+  // path: "-" or an existing file.
+  VideoWriter(OutputKind kind, const std::string& path, const Reader& reader,
+              const VideoFormat& format);
+
+  // frame.pts and `duration` in units of the input video's time base, AV_NOPTS_VALUE and 0 if
+  // unknown. Takes the audio packets off `audio` that begin before the frame.
+  void write(AVFrame& frame, int64_t duration, std::deque<PacketPtr>& audio);
+
+  // End of the last frame so far, in AV_TIME_BASE units of the input.
+  int64_t end() const;
+
+  // Writes what is still held back, of the audio only what begins before `audio_end`
+  // (AV_TIME_BASE units), and completes the file.
+  void finish(std::deque<PacketPtr>& audio, int64_t audio_end);
+
+ private:
+  void open_encoder(const VideoFormat& format);
+  void add_video_stream(const Reader& reader);
+  void add_audio_streams(const Reader& reader);
+  void open_file(const std::string& path);
+  int64_t place_in_time(int64_t pts, int64_t duration);
+  void encode(const AVFrame* frame);
+  void write_packet(AVPacket& packet);
+  void write_audio_before(int64_t end, std::deque<PacketPtr>& audio);
+
+  struct AudioTrack {
+    AVRational input_base;
+    AVStream* output;
+  };
+
+  bool is_y4m_;
+  bool has_constant_rate_;
+  OutputPtr container_;
+  EncoderPtr encoder_;
+  PacketPtr packet_ = make_packet();
+  AVStream* video_ = nullptr;             // owned by the container
+  std::map<int, AudioTrack> audio_;       // by index of the input's stream
+  std::map<int64_t, int64_t> durations_;  // of the frames in the encoder, by time stamp
+  AVRational frame_rate_;
+  AVRational input_base_;
+  int64_t start_ = 0;         // of the input, in AV_TIME_BASE units; the output starts at 0
+  int64_t frame_length_ = 1;  // typical, in units of input_base_
+  int64_t frames_ = 0;
+  int64_t last_pts_ = 0;  // of the input, in units of input_base_
+  int64_t last_duration_ = 0;
+};
+
+}  // namespace dehaze
+
+#endif  // TOOLS_MEDIA_WRITER_VIDEO_H

@@ -1,0 +1,105 @@
+#include "picture_metrics.h"
+
+#include <array>
+#include <cmath>
+#include <limits>
+
+namespace dehaze {
+namespace {
+
+constexpr int kWindow = 11;
+constexpr double kSigma = 1.5;
+constexpr double kPeak = 255;
+
+using Plane = std::vector<double>;
+
+Plane luma_of(const RgbPicture& picture) {
+  Plane luma(picture.bytes.size() / 3);
+  for (size_t i = 0; i < luma.size(); ++i) {
+    const uint8_t* rgb = &picture.bytes[i * 3];
+    luma[i] = 0.299 * rgb[0] + 0.587 * rgb[1] + 0.114 * rgb[2];
+  }
+  return luma;
+}
+
+std::array<double, kWindow> gaussian_window() {
+  std::array<double, kWindow> weights;
+  double sum = 0;
+  for (int i = 0; i < kWindow; ++i) {
+    const double distance = i - kWindow / 2;
+    weights[static_cast<size_t>(i)] = std::exp(-distance * distance / (2 * kSigma * kSigma));
+    sum += weights[static_cast<size_t>(i)];
+  }
+  for (double& weight : weights) weight /= sum;
+  return weights;
+}
+
+// Of a row (step 1) or a column (step: samples per row).
+double weighted_sum(const double* samples, size_t step,
+                    const std::array<double, kWindow>& weights) {
+  double sum = 0;
+  for (const double weight : weights) {
+    sum += weight * *samples;
+    samples += step;
+  }
+  return sum;
+}
+
+// Gaussian mean of every window that lies wholly in the plane: (width - 10) x (height - 10).
+Plane window_means(const Plane& plane, size_t width, size_t height) {
+  static const std::array<double, kWindow> kWeights = gaussian_window();
+  const size_t columns = width - kWindow + 1;
+  const size_t rows = height - kWindow + 1;
+  Plane across(columns * height);
+  for (size_t y = 0; y < height; ++y) {
+    for (size_t x = 0; x < columns; ++x) {
+      across[y * columns + x] = weighted_sum(&plane[y * width + x], 1, kWeights);
+    }
+  }
+  Plane means(columns * rows);
+  for (size_t i = 0; i < means.size(); ++i) means[i] = weighted_sum(&across[i], columns, kWeights);
+  return means;
+}
+
+Plane product(const Plane& a, const Plane& b) {
+  Plane result(a.size());
+  for (size_t i = 0; i < a.size(); ++i) result[i] = a[i] * b[i];
+  return result;
+}
+
+}  // namespace
+
+double psnr_rgb(const RgbPicture& a, const RgbPicture& b) {
+  double squares = 0;
+  for (size_t i = 0; i < a.bytes.size(); ++i) {
+    const double difference = a.bytes[i] - b.bytes[i];
+    squares += difference * difference;
+  }
+  if (squares == 0) return std::numeric_limits<double>::infinity();
+  return 10 * std::log10(kPeak * kPeak * static_cast<double>(a.bytes.size()) / squares);
+}
+
+double ssim_luma(const RgbPicture& picture_a, const RgbPicture& picture_b) {
+  constexpr double kC1 = (0.01 * kPeak) * (0.01 * kPeak);
+  constexpr double kC2 = (0.03 * kPeak) * (0.03 * kPeak);
+  const size_t width = static_cast<size_t>(picture_a.width);
+  const size_t height = static_cast<size_t>(picture_a.height);
+  const Plane a = luma_of(picture_a);
+  const Plane b = luma_of(picture_b);
+  const Plane mean_a = window_means(a, width, height);
+  const Plane mean_b = window_means(b, width, height);
+  const Plane mean_aa = window_means(product(a, a), width, height);
+  const Plane mean_bb = window_means(product(b, b), width, height);
+  const Plane mean_ab = window_means(product(a, b), width, height);
+  double sum = 0;
+  for (size_t i = 0; i < mean_a.size(); ++i) {
+    const double means = mean_a[i] * mean_b[i];
+    const double squares = mean_a[i] * mean_a[i] + mean_b[i] * mean_b[i];
+    const double covariance = mean_ab[i] - means;
+    const double variances = mean_aa[i] + mean_bb[i] - squares;
+    sum += (2 * means + kC1) * (2 * covariance + kC2) / ((squares + kC1) * (variances + kC2));
+  }
+  return sum / static_cast<double>(mean_a.size());
+}
+
+}  // namespace dehaze

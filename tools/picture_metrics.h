@@ -1,0 +1,26 @@
+// How close one picture is to another.
+#ifndef TOOLS_PICTURE_METRICS_H
+#define TOOLS_PICTURE_METRICS_H
+
+#include <cstdint>
+#include <vector>
+
+namespace dehaze {
+
+struct RgbPicture {
+  int width = 0;
+  int height = 0;
+  std::vector<uint8_t> bytes;  // R, G, B; packed rows
+};
+
+// Peak signal-to-noise ratio over all samples of all three channels, in dB; infinity if equal.
+double psnr_rgb(const RgbPicture& a, const RgbPicture& b);
+
+// Mean structural similarity of full-range BT.601 luma as in the paper of 2004: 11 x 11 Gaussian
+// window with a standard deviation of 1.5, K1 = 0.01, K2 = 0.03, all windows that lie wholly in the
+// picture. Pictures have at least 11 x 11 pixels.
+double ssim_luma(const RgbPicture& a, const RgbPicture& b);
+
+}  // namespace dehaze
+
+#endif  // TOOLS_PICTURE_METRICS_H
