@@ -5,7 +5,7 @@
 #include <vector>
 
 int main() {
-  const int width = 640, height = 480, level = 20;
+  const int width = 640, height = 480, level = 10;
   std::vector<unsigned char> frame(width * height * 3 / 2, 128);
 
   InitHazePreviewFormat(kInputFormatNv21, width, height);
