@@ -10,7 +10,8 @@
 
 namespace haze::color {
 
-// Pixels [begin, end). Chroma is not clamped: a Cr or Cb of 256, as pure red gives it, is stored as 0.
+// Pixels [begin, end). Chroma is not clamped: a Cr or Cb of 256, as pure red gives it, is stored as
+// 0.
 inline void bgr_to_ycrcb_portable(const uint8_t* bgr, uint8_t* ycrcb, size_t begin, size_t end) {
   for (size_t i = begin; i < end; ++i) {
     const int blue = bgr[3 * i];

@@ -6,7 +6,8 @@
 
 namespace haze::color {
 
-// As min_map_portable and min_max_maps_portable; both return the first pixel that they did not write.
+// As min_map_portable and min_max_maps_portable; both return the first pixel that they did not
+// write.
 template <typename V>
 size_t min_map_x86(const uint8_t* pixels, uint8_t* min_map, size_t end) {
   size_t i = 0;

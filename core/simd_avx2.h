@@ -1,5 +1,5 @@
-// 256-bit vectors under the names that the x86 kernels are written in; see simd_avx512.h. For source
-// files compiled with the flags of CpuLevel::kAvx2 only.
+// 256-bit vectors under the names that the x86 kernels are written in; see simd_avx512.h. For
+// source files compiled with the flags of CpuLevel::kAvx2 only.
 #pragma once
 
 #include <immintrin.h>
@@ -26,7 +26,7 @@ struct Avx2 {
   static Int set16(int a) { return _mm256_set1_epi16(static_cast<short>(a)); }
   static Int set32(int a) { return _mm256_set1_epi32(a); }
   static Int set_pairs16(int even, int odd) {
-    return _mm256_set1_epi32((odd << 16) | (even & 0xFFFF));
+    return _mm256_set1_epi32(odd * 65536 + (even & 0xFFFF));
   }
 
   static Int bit_and(Int a, Int b) { return _mm256_and_si256(a, b); }
@@ -156,8 +156,8 @@ struct Avx2 {
   }
 
   // A table of 256 bytes as sixteen of 16. A byte shuffle gives 0 where bit 7 of the index is set;
-  // adding 0x70 with saturation sets it for every byte outside 0 ... 15 and leaves the lower bits of
-  // the others, so each table answers for its own range alone.
+  // adding 0x70 with saturation sets it for every byte outside 0 ... 15 and leaves the lower bits
+  // of the others, so each table answers for its own range alone.
   struct Table {
     explicit Table(const uint8_t* table_bytes) : bytes(table_bytes) {}
 

@@ -1,5 +1,5 @@
-// 512-bit vectors under the names that the x86 kernels are written in. For source files compiled with
-// the flags of CpuLevel::kAvx512 only.
+// 512-bit vectors under the names that the x86 kernels are written in. For source files compiled
+// with the flags of CpuLevel::kAvx512 only.
 #pragma once
 
 #include <immintrin.h>
@@ -25,7 +25,7 @@ struct Avx512 {
   static Int set32(int a) { return _mm512_set1_epi32(a); }
   // Pairs of 16-bit values, `even` in the lower half of each 32 bits.
   static Int set_pairs16(int even, int odd) {
-    return _mm512_set1_epi32((odd << 16) | (even & 0xFFFF));
+    return _mm512_set1_epi32(odd * 65536 + (even & 0xFFFF));
   }
 
   static Int bit_and(Int a, Int b) { return _mm512_and_si512(a, b); }
@@ -53,8 +53,8 @@ struct Avx512 {
     return _mm512_srai_epi32(a, kBits);
   }
 
-  // Zero bytes below the bytes of `a`, and back from 32 to 16 bits. Both work within 128-bit lanes and
-  // cancel out.
+  // Zero bytes below the bytes of `a`, and back from 32 to 16 bits. Both work within 128-bit lanes
+  // and cancel out.
   static Int low_as_high_bytes(Int a) { return _mm512_unpacklo_epi8(_mm512_setzero_si512(), a); }
   static Int high_as_high_bytes(Int a) { return _mm512_unpackhi_epi8(_mm512_setzero_si512(), a); }
   static Int narrow32(Int low, Int high) { return _mm512_packs_epi32(low, high); }

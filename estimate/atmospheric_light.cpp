@@ -23,9 +23,9 @@ int brightest_populated_bin(const int* histogram, int target) {
   return chosen;
 }
 
-// The sum, which wraps at 32 bits, is divided as a signed number; it wraps from 8 million pixels on.
-// Double precision gives the same quotient: one that is no integer is 1 / count from the next one,
-// and quotient * count stays far below 2^52. 32-bit ARM divides it in hardware.
+// The sum, which wraps at 32 bits, is divided as a signed number; it wraps from 8 million pixels
+// on. Double precision gives the same quotient: one that is no integer is 1 / count from the next
+// one, and quotient * count stays far below 2^52. 32-bit ARM divides it in hardware.
 uint8_t mean_byte(uint32_t sum, int32_t count) {
   if (count == 0) return 255;
   return static_cast<uint8_t>(static_cast<int32_t>(static_cast<double>(static_cast<int32_t>(sum)) /

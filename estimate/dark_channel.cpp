@@ -45,8 +45,7 @@ void getMinChannel_horPreview(unsigned char* src, unsigned char* dst, int n, int
 
 void getMCandHistPreview(unsigned char* src, unsigned char* dst, int* hist, int n, int dstStride,
                          int r) {
-  if (!filter_line<LeastByte>(src, dst, n, dstStride, r)) return;
-  for (int i = 0; i < n; ++i) ++hist[dst[static_cast<ptrdiff_t>(i) * dstStride]];
+  filter_line<LeastByte>(src, dst, n, dstStride, r, [=](uint8_t output) { ++hist[output]; });
 }
 
 void getMinChannel_verPreview(unsigned char* src, unsigned char* dst, int cols, int h, int r,

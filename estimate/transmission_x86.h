@@ -8,7 +8,8 @@
 
 namespace haze::estimate {
 
-// As group_codes_portable with the pixels' own minima; returns the first pixel that it did not write.
+// As group_codes_portable with the pixels' own minima; returns the first pixel that it did not
+// write.
 //
 // Of two operands of which one is not a number min and max give the second, which here is the value
 // that is handed on; truncated it is the least integer, which clamps to code 0.

@@ -42,9 +42,9 @@ int slide_rows_avx2(int16_t* sums, const uint8_t* entering, const uint8_t* leavi
 int slide_rows_avx512(int16_t* sums, const uint8_t* entering, const uint8_t* leaving, int width);
 
 // Means of windows that move on by one column per pixel: `sum` is the window's before the first of
-// them; entering[x] and leaving[x] are the column sums that pixel x adds and drops. Returns the first
-// pixel that it did not write, and leaves the sum of the pixel before it. For sums below 2^24 and
-// counts up to 2^16.
+// them; entering[x] and leaving[x] are the column sums that pixel x adds and drops. Returns the
+// first pixel that it did not write, and leaves the sum of the pixel before it. For sums below 2^24
+// and counts up to 2^16.
 int mean_windows_16_avx2(const int16_t* entering, const int16_t* leaving, uint8_t* dst, int pixels,
                          int32_t& sum, int count);
 int mean_windows_16_avx512(const int16_t* entering, const int16_t* leaving, uint8_t* dst,
@@ -104,9 +104,9 @@ inline int mean_windows(const int32_t* entering, const int32_t* leaving, uint8_t
 // Sums that may pass 2^24.
 inline int mean_windows(const int32_t*, const int32_t*, uint8_t*, int, double&, int) { return 0; }
 
-// Means of one output row: dst[x] = divide(sum of the column sums in the window of x, rows, columns).
-// The window grows at the left border, keeps its width in the middle and shrinks at the right one.
-// Needs width >= before + after + 1.
+// Means of one output row: dst[x] = divide(sum of the column sums in the window of x, rows,
+// columns). The window grows at the left border, keeps its width in the middle and shrinks at the
+// right one. Needs width >= before + after + 1.
 template <typename RowSum, typename Sum, typename Divide>
 inline void mean_row(const Sum* sums, uint8_t* dst, int width, Reach reach, int rows,
                      Divide divide) {

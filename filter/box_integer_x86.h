@@ -19,8 +19,8 @@ int slide_rows_x86(int16_t* sums, const uint8_t* entering, const uint8_t* leavin
 }
 
 // Means of windows that move on by one column per pixel: `sum` is the window's before the first of
-// them; entering[x] and leaving[x] are the column sums that pixel x adds and drops. Returns the first
-// pixel that it did not write, and leaves the sum of the pixel before it.
+// them; entering[x] and leaving[x] are the column sums that pixel x adds and drops. Returns the
+// first pixel that it did not write, and leaves the sum of the pixel before it.
 //
 // Exact for sums below 2^24 and counts up to 2^16, see divide_small in box_integer.cpp.
 template <typename V, typename Sum>

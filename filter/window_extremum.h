@@ -119,18 +119,26 @@ class WindowLines {
   Scratch<Value> buffers_;
 };
 
-// One line of `samples` contiguous samples; outputs lie `dst_stride` apart. If memory is short, or
-// the radius negative, nothing is written.
-template <typename Extremum>
-inline bool filter_line(const typename Extremum::Value* src, typename Extremum::Value* dst,
-                        int samples, ptrdiff_t dst_stride, int radius) {
-  if (samples < 1 || radius < 0) return false;
+// One line of `samples` contiguous samples; outputs lie `dst_stride` apart and are also given to
+// visit(output). If memory is short, or the radius negative, nothing is written.
+template <typename Extremum, typename Visit>
+inline void filter_line(const typename Extremum::Value* src, typename Extremum::Value* dst,
+                        int samples, ptrdiff_t dst_stride, int radius, Visit visit) {
+  if (samples < 1 || radius < 0) return;
   WindowLines<Extremum> line(samples, radius, 1);
-  if (!line) return false;
+  if (!line) return;
   memcpy(line.sample(0), src, static_cast<size_t>(samples) * sizeof *src);
   const typename Extremum::Value* const extrema = line.filter();
-  for (int i = 0; i < samples; ++i) dst[i * dst_stride] = extrema[i];
-  return true;
+  for (int i = 0; i < samples; ++i) {
+    dst[i * dst_stride] = extrema[i];
+    visit(extrema[i]);
+  }
+}
+
+template <typename Extremum>
+inline void filter_line(const typename Extremum::Value* src, typename Extremum::Value* dst,
+                        int samples, ptrdiff_t dst_stride, int radius) {
+  filter_line<Extremum>(src, dst, samples, dst_stride, radius, [](typename Extremum::Value) {});
 }
 
 // All rows of an image whose rows lie `stride` samples apart.

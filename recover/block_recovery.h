@@ -61,8 +61,8 @@ inline void recover_anchors_of_row(const PlanarFrame& frame, int block_y,
     luma[2 * x] = recovery.luma(luma[2 * x], anchor_index(t[x]));
 }
 
-// The other three luma of all blocks of one row but the last, as means of the recovered top-left ones
-// around them, and the chroma.
+// The other three luma of all blocks of one row but the last, as means of the recovered top-left
+// ones around them, and the chroma.
 inline void fill_between_anchors(const PlanarFrame& frame, int block_y,
                                  const IntegerRecovery& recovery) {
   const BlockRow row = frame.row(block_y);

@@ -5,7 +5,8 @@
 
 namespace haze::recover {
 
-// Two luma rows and the chroma samples that belong to them. In NV21 frames V and U alternate, V first.
+// Two luma rows and the chroma samples that belong to them. In NV21 frames V and U alternate, V
+// first.
 struct BlockRow {
   uint8_t* luma_top;
   uint8_t* luma_bottom;

@@ -18,8 +18,8 @@ enum class ChromaLayout {
   kPlanarUv,       // I420
 };
 
-// Rewrites a frame of width x height pixels, both even. Tables are taken from `kept`, where there are
-// any; otherwise they are built for the call.
+// Rewrites a frame of width x height pixels, both even. Tables are taken from `kept`, where there
+// are any; otherwise they are built for the call.
 void recover_frame(uint8_t* frame, CodeMap map, int width, int height, ChromaLayout layout,
                    LightAnchor anchor, KeptTables* kept);
 

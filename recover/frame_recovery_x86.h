@@ -1,5 +1,5 @@
-// Vector paths of the recoveries of NV21 and planar frames for x86-64, by vector type: arithmetic in
-// place of tables.
+// Vector paths of the recoveries of NV21 and planar frames for x86-64, by vector type: arithmetic
+// in place of tables.
 #pragma once
 
 #include <stdint.h>

@@ -12,8 +12,8 @@
 
 namespace haze::recover {
 
-// 65536 / index, truncated, of the index that `scaled` truncates to within 0 ... 255, which is 0 for
-// what is not a number.
+// 65536 / index, truncated, of the index that `scaled` truncates to within 0 ... 255, which is 0
+// for what is not a number.
 //
 // Exact: a quotient q = 65536 / n that is no integer is at least 1 / n below the next one, which is
 // more than its rounding error of at most q / 2^24. Index 0 has the reciprocal of 1.
@@ -91,8 +91,8 @@ int recover_every_pixel_x86(BlockRow row, const float* t, const float* next_t, i
   return x;
 }
 
-// The top-left luma of each block, the other luma left alone; returns the first block that it did not
-// recover.
+// The top-left luma of each block, the other luma left alone; returns the first block that it did
+// not recover.
 template <typename V>
 int recover_anchors_x86(uint8_t* luma, const float* t, int blocks, float anchor,
                         const uint8_t* tone_curve) {
@@ -116,8 +116,8 @@ int recover_anchors_x86(uint8_t* luma, const float* t, int blocks, float anchor,
 }
 
 // The other three luma of each block as means of the recovered top-left ones around it, and the
-// chroma; returns the first block that it did not finish, never past the last but one. `next` is the
-// luma row below the blocks.
+// chroma; returns the first block that it did not finish, never past the last but one. `next` is
+// the luma row below the blocks.
 template <typename V>
 int fill_between_anchors_x86(BlockRow row, const uint8_t* next, const float* t, int blocks,
                              FloatAnchor anchor) {
@@ -147,7 +147,8 @@ int fill_between_anchors_x86(BlockRow row, const uint8_t* next, const float* t, 
 }
 
 // Two rows of a packed frame (Y0, Cr, Y1, Cb) into another one, as recover_row_pair in
-// packed_recovery.cpp; returns the first block that it did not recover, never past the last but one.
+// packed_recovery.cpp; returns the first block that it did not recover, never past the last but
+// one.
 template <typename V>
 int recover_packed_rows_x86(const uint8_t* src, uint8_t* dst, ptrdiff_t row_bytes, const float* t,
                             const float* next_t, int blocks, FloatAnchor anchor,

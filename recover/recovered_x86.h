@@ -5,8 +5,8 @@
 
 namespace haze::recover {
 
-// How samples are recovered around an anchor. Each gives 32-bit integers that still have to be clamped
-// to 0 ... 255.
+// How samples are recovered around an anchor. Each gives 32-bit integers that still have to be
+// clamped to 0 ... 255.
 
 // trunc(anchor + (sample - anchor) * factor)
 template <typename V>

@@ -31,19 +31,14 @@ void zoom_row(const float* src, float* dst, int width) {
   dst[2 * width - 1] = src[width - 1];
 }
 
-}  // namespace
-
-void* ZoomOutThreadPreview(void* arg) {
-  const haze::StripeCode code = haze::decode_stripe(arg);
-  if (!haze::is_stripe(code, kThreads)) return nullptr;
+// Converts rows of the frame that a slot describes. Both bounds are even.
+void convert_rows(int slot, haze::StripeRange rows) {
+  if (rows.end <= rows.begin) return;
   const ptrdiff_t width = gZoomOutWPreview;
   const ptrdiff_t height = gZoomOutHPreview;
-  // Odd sides would end in blocks whose chroma the frame does not have.
-  if (width < 1 || height < 1 || width % 2 != 0 || height % 2 != 0) return nullptr;
-  const haze::StripeRange rows = zoom_stripe(gZoomOutHPreview, code.stripe);
-  unsigned char* const frame = gZoomOutSrcPreview[code.slot];
+  unsigned char* const frame = gZoomOutSrcPreview[slot];
   unsigned char* const luma = frame + width * rows.begin;
-  unsigned char* const bgr = gZoomOutDstPreview[code.slot] + width * rows.begin / 4 * 3;
+  unsigned char* const bgr = gZoomOutDstPreview[slot] + width * rows.begin / 4 * 3;
   if (gPerviewFormat == kInputFormatPlanar) {
     xYCrCb2BGRPreview(luma, frame + width * height + width / 2 * (rows.begin / 2), bgr,
                       gZoomOutWPreview, rows.end - rows.begin);
@@ -51,6 +46,34 @@ void* ZoomOutThreadPreview(void* arg) {
     xYCrCb2BGRPreview_NV21(luma, frame + width * height + width * (rows.begin / 2), bgr,
                            gZoomOutWPreview, rows.end - rows.begin);
   }
+}
+
+// Odd sides would end in blocks whose chroma the frame does not have.
+bool has_frame() {
+  return gZoomOutWPreview >= 1 && gZoomOutHPreview >= 1 && gZoomOutWPreview % 2 == 0 &&
+         gZoomOutHPreview % 2 == 0;
+}
+
+// Worker beside all others of its slot: as ZoomOutThreadPreview, but stripe 3 leaves the rows out
+// that stripes 4 ... 7 convert as well, so that no byte is written by two threads.
+void* convert_own_rows(void* arg) {
+  const haze::StripeCode code = haze::decode_stripe(arg);
+  if (code.stripe != 3) return ZoomOutThreadPreview(arg);
+  if (!has_frame()) return nullptr;
+  const haze::StripeRange rows = zoom_stripe(gZoomOutHPreview, 3);
+  const int next_begin = zoom_stripe(gZoomOutHPreview, 4).begin;
+  const int last_end = zoom_stripe(gZoomOutHPreview, 7).end;
+  convert_rows(code.slot, {rows.begin, next_begin});
+  convert_rows(code.slot, {last_end, rows.end});
+  return nullptr;
+}
+
+}  // namespace
+
+void* ZoomOutThreadPreview(void* arg) {
+  const haze::StripeCode code = haze::decode_stripe(arg);
+  if (haze::is_stripe(code, kThreads) && has_frame())
+    convert_rows(code.slot, zoom_stripe(gZoomOutHPreview, code.stripe));
   return nullptr;
 }
 
@@ -60,7 +83,7 @@ void ZoomOutImgPreview(unsigned char* src, unsigned char* dst, int width, int he
   gZoomOutDstPreview[slot] = dst;
   gZoomOutWPreview = width;
   gZoomOutHPreview = height;
-  haze::run_stripes<kThreads>(ZoomOutThreadPreview, slot);
+  haze::run_stripes<kThreads>(convert_own_rows, slot);
 }
 
 void ZoomIn_Linear_fPreview(const float* src, float* dst, int width, int height) {

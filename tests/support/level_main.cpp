@@ -24,9 +24,8 @@ bool set_level(const char* name) {
   const struct {
     const char* name;
     CpuLevel level;
-  } levels[] = {{"portable", CpuLevel::kPortable},
-                {"avx2", CpuLevel::kAvx2},
-                {"avx512", CpuLevel::kAvx512}};
+  } levels[] = {
+      {"portable", CpuLevel::kPortable}, {"avx2", CpuLevel::kAvx2}, {"avx512", CpuLevel::kAvx512}};
   for (const auto& choice : levels) {
     if (std::strcmp(name, choice.name) != 0) continue;
     haze::limit_cpu_level(choice.level);

@@ -45,11 +45,11 @@ std::vector<uint8_t> run(const PlanarMember& member, std::vector<uint8_t> frame,
 std::vector<uint8_t> AllValues::frame() {
   std::vector<uint8_t> frame;
   for (size_t i = 0; i < kLumaBytes; ++i) frame.push_back(static_cast<uint8_t>(i * 77 / 4));
-  for (int i = 0; i < 256; ++i) frame.push_back(static_cast<uint8_t>(i));
-  for (int i = 255; i >= 0; --i) frame.push_back(static_cast<uint8_t>(i));
+  for (size_t i = 0; i < kChromaBytes; ++i) frame.push_back(static_cast<uint8_t>(i));
+  for (size_t i = 0; i < kChromaBytes; ++i) frame.push_back(static_cast<uint8_t>(255 - i));
   return frame;
 }
 
-std::vector<float> AllValues::map(float t) { return std::vector<float>(kLumaBytes / 4, t); }
+std::vector<float> AllValues::map(float t) { return std::vector<float>(kChromaBytes, t); }
 
 }  // namespace haze::test

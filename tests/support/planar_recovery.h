@@ -28,11 +28,14 @@ void compare(const PlanarMember& member, const std::vector<uint8_t>& frame,
 std::vector<uint8_t> run(const PlanarMember& member, std::vector<uint8_t> frame,
                          std::vector<float> map, Light light, int width, int height);
 
-// A square frame that holds every byte value four times in luma, and once in each chroma plane in
-// opposite orders, with a map of one value.
+// A frame that holds every byte value four times in luma, and in each chroma plane in opposite
+// orders, with a map of one value. Its rows are a little longer than whole steps of any vector
+// path.
 struct AllValues {
-  static constexpr int kSide = 32;
-  static constexpr size_t kLumaBytes = kSide * kSide;
+  static constexpr int kWidth = 264;
+  static constexpr int kHeight = 4;
+  static constexpr size_t kLumaBytes = kWidth * kHeight;
+  static constexpr size_t kChromaBytes = kLumaBytes / 4;
 
   static std::vector<uint8_t> frame();
   static std::vector<float> map(float t);
