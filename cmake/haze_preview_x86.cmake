@@ -6,8 +6,10 @@ if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(x86_64|AMD64)$" AND NOT HAZE_PREVIEW_PORTAB
     color/channel_maps
     color/convert
     color/max_min_nv21
+    estimate/float_transmission
     estimate/transmission
     filter/box_integer
+    filter/window_extremum
     recover/frame_recovery
     recover/reciprocal)
   set(avx2_flags -mavx2)

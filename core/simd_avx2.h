@@ -125,6 +125,7 @@ struct Avx2 {
     return _mm256_cvtepi32_ps(
         _mm256_cvtepu8_epi32(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(from))));
   }
+  static void store_floats(float* to, Float a) { _mm256_storeu_ps(to, a); }
   static Float load_floats(const float* from) { return _mm256_loadu_ps(from); }
   static Float interleave_low(Float a, Float b) {
     return _mm256_permute2f128_ps(_mm256_unpacklo_ps(a, b), _mm256_unpackhi_ps(a, b), 0x20);

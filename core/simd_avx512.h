@@ -137,6 +137,7 @@ struct Avx512 {
     return _mm512_cvtepi32_ps(
         _mm512_cvtepu8_epi32(_mm_loadu_si128(reinterpret_cast<const __m128i*>(from))));
   }
+  static void store_floats(float* to, Float a) { _mm512_storeu_ps(to, a); }
   static Float load_floats(const float* from) { return _mm512_loadu_ps(from); }
   // Lanes of a and b in turn, a first: the first half and the second half.
   static Float interleave_low(Float a, Float b) {
