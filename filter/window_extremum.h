@@ -176,11 +176,12 @@ inline bool filter_rows(const typename Extremum::Value* src, typename Extremum::
   return true;
 }
 
-// All columns, in bundles that fill a cache line.
+// All columns, in bundles of a few cache lines: wide enough to read whole lines, narrow enough to
+// stay in the second-level cache.
 template <typename Extremum>
 inline bool filter_columns(const typename Extremum::Value* src, typename Extremum::Value* dst,
                            int width, int height, ptrdiff_t stride, int radius) {
-  constexpr int kBundle = 64 / sizeof(typename Extremum::Value);
+  constexpr int kBundle = 512 / sizeof(typename Extremum::Value);
   if (width < 1 || height < 1 || radius < 0) return false;
   WindowLines<Extremum> columns(height, radius, min(kBundle, width));
   if (!columns) return false;
