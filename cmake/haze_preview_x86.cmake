@@ -6,8 +6,13 @@ if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(x86_64|AMD64)$" AND NOT HAZE_PREVIEW_PORTAB
     color/channel_maps
     color/convert
     color/max_min_nv21
+    estimate/float_transmission
     estimate/transmission
+    filter/box_float
     filter/box_integer
+    filter/guided
+    filter/window_extremum
+    recover/brightness
     recover/frame_recovery
     recover/reciprocal)
   set(avx2_flags -mavx2)

@@ -125,6 +125,7 @@ struct Avx2 {
     return _mm256_cvtepi32_ps(
         _mm256_cvtepu8_epi32(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(from))));
   }
+  static void store_floats(float* to, Float a) { _mm256_storeu_ps(to, a); }
   static Float load_floats(const float* from) { return _mm256_loadu_ps(from); }
   static Float interleave_low(Float a, Float b) {
     return _mm256_permute2f128_ps(_mm256_unpacklo_ps(a, b), _mm256_unpackhi_ps(a, b), 0x20);
@@ -144,6 +145,16 @@ struct Avx2 {
   static Float sub(Float a, Float b) { return _mm256_sub_ps(a, b); }
   static Float mul(Float a, Float b) { return _mm256_mul_ps(a, b); }
   static Float div(Float a, Float b) { return _mm256_div_ps(a, b); }
+  static Float size_of(Float a) { return _mm256_andnot_ps(set_float(-0.0f), a); }
+  static Float wide_quotient(Float a, Float b, double c) {
+    const auto half = [c](__m128 x, __m128 y) {
+      return _mm256_cvtpd_ps(
+          _mm256_div_pd(_mm256_cvtps_pd(x), _mm256_add_pd(_mm256_cvtps_pd(y), _mm256_set1_pd(c))));
+    };
+    const __m128 low = half(_mm256_castps256_ps128(a), _mm256_castps256_ps128(b));
+    const __m128 high = half(_mm256_extractf128_ps(a, 1), _mm256_extractf128_ps(b, 1));
+    return _mm256_insertf128_ps(_mm256_castps128_ps256(low), high, 1);
+  }
   static Float min(Float a, Float b) { return _mm256_min_ps(a, b); }
   static Float max(Float a, Float b) { return _mm256_max_ps(a, b); }
   static Float to_float(Int a) { return _mm256_cvtepi32_ps(a); }

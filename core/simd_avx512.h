@@ -137,6 +137,7 @@ struct Avx512 {
     return _mm512_cvtepi32_ps(
         _mm512_cvtepu8_epi32(_mm_loadu_si128(reinterpret_cast<const __m128i*>(from))));
   }
+  static void store_floats(float* to, Float a) { _mm512_storeu_ps(to, a); }
   static Float load_floats(const float* from) { return _mm512_loadu_ps(from); }
   // Lanes of a and b in turn, a first: the first half and the second half.
   static Float interleave_low(Float a, Float b) {
@@ -158,6 +159,17 @@ struct Avx512 {
   static Float sub(Float a, Float b) { return _mm512_sub_ps(a, b); }
   static Float mul(Float a, Float b) { return _mm512_mul_ps(a, b); }
   static Float div(Float a, Float b) { return _mm512_div_ps(a, b); }
+  static Float size_of(Float a) { return _mm512_abs_ps(a); }
+  // a / (b + c) in double precision, narrowed.
+  static Float wide_quotient(Float a, Float b, double c) {
+    const auto half = [c](__m256 x, __m256 y) {
+      return _mm512_cvtpd_ps(
+          _mm512_div_pd(_mm512_cvtps_pd(x), _mm512_add_pd(_mm512_cvtps_pd(y), _mm512_set1_pd(c))));
+    };
+    const __m256 low = half(_mm512_castps512_ps256(a), _mm512_castps512_ps256(b));
+    const __m256 high = half(_mm512_extractf32x8_ps(a, 1), _mm512_extractf32x8_ps(b, 1));
+    return _mm512_insertf32x8(_mm512_castps256_ps512(low), high, 1);
+  }
   // a < b ? a : b and a > b ? a : b; b where either is not a number.
   static Float min(Float a, Float b) { return _mm512_min_ps(a, b); }
   static Float max(Float a, Float b) { return _mm512_max_ps(a, b); }

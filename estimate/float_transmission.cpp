@@ -2,6 +2,7 @@
 // complement of the scaled dark channel of the image over its light.
 #include "core/image_size.h"
 #include "core/scratch.h"
+#include "estimate/float_transmission_kernels.h"
 #include "filter/window_extremum.h"
 #include "haze_preview.h"
 
@@ -12,7 +13,6 @@ using haze::filter::MostFloat;
 // Share of the haze that is taken away, by level.
 constexpr float kStrengths[10] = {0.0f, 0.1f, 0.2f, 0.3f, 0.4f, 0.5f, 0.6f, 0.7f, 0.8f, 0.9f};
 constexpr float kDefaultStrength = 0.3f;
-constexpr float kLeastTransmission = 0.4f;
 constexpr int kRadius = 7;
 
 float strength_of(int level) {
@@ -24,16 +24,32 @@ float strength_of(int level) {
 struct ChannelTable {
   float values[256];
 
-  ChannelTable(float strength, uint8_t light) {
-    const float scale = strength / static_cast<float>(light);
-    for (int byte = 0; byte < 256; ++byte) {
-      const float t = 1.0f - scale * static_cast<float>(byte);
-      values[byte] = t > 1.0f ? 1.0f : t < kLeastTransmission ? kLeastTransmission : t;
-    }
+  explicit ChannelTable(float scale) {
+    for (int byte = 0; byte < 256; ++byte)
+      values[byte] = haze::estimate::clamped_transmission(scale, static_cast<uint8_t>(byte));
   }
 };
 
 float larger(float a, float b) { return a < b ? b : a; }
+
+// t[i] = the largest transmission of the channels of pixel i.
+void largest_transmissions(const uint8_t* pixels, const float (&scales)[3], float* t,
+                           size_t count) {
+  size_t i = 0;
+#if HAZE_X86
+  if (const auto kernel = haze::x86_kernel(haze::estimate::largest_transmissions_avx2,
+                                           haze::estimate::largest_transmissions_avx512))
+    i = kernel(pixels, scales, haze::estimate::kLeastFloatTransmission, t, count);
+#endif
+  if (i == count) return;
+  const ChannelTable first(scales[0]);
+  const ChannelTable second(scales[1]);
+  const ChannelTable third(scales[2]);
+  for (; i < count; ++i) {
+    t[i] = larger(larger(first.values[pixels[3 * i]], second.values[pixels[3 * i + 1]]),
+                  third.values[pixels[3 * i + 2]]);
+  }
+}
 
 }  // namespace
 
@@ -43,13 +59,10 @@ void EstimateTPreview(unsigned char* src, unsigned char* A, float* t, float* tRa
   haze::Scratch<float> rows(count);
   if (count == 0 || !rows) return;
   const float strength = strength_of(level);
-  const ChannelTable first(strength, A[0]);
-  const ChannelTable second(strength, A[1]);
-  const ChannelTable third(strength, A[2]);
-  for (size_t i = 0; i < count; ++i) {
-    tRaw[i] = larger(larger(first.values[src[3 * i]], second.values[src[3 * i + 1]]),
-                     third.values[src[3 * i + 2]]);
-  }
+  float scales[3];
+  for (int channel = 0; channel < 3; ++channel)
+    scales[channel] = strength / static_cast<float>(A[channel]);
+  largest_transmissions(src, scales, tRaw, count);
   if (haze::filter::filter_rows<MostFloat>(tRaw, rows.data(), w, h, w, kRadius))
     haze::filter::filter_columns<MostFloat>(rows.data(), t, w, h, w, kRadius);
 }

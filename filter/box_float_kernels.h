@@ -8,15 +8,37 @@
 #include <stddef.h>
 #include <stdint.h>
 
+#include "core/cpu_level.h"
 #include "core/target.h"
+#include "filter/box_float_step.h"
 
 namespace haze::filter {
+
+#if HAZE_X86
+// The vector part of a step of the column sums; each returns the first column that it did not
+// write.
+ptrdiff_t next_sums_of_plane_avx2(ColumnStep step, const float* above, float* sums,
+                                  RowPointers entering, RowPointers leaving, ptrdiff_t width);
+ptrdiff_t next_sums_of_plane_avx512(ColumnStep step, const float* above, float* sums,
+                                    RowPointers entering, RowPointers leaving, ptrdiff_t width);
+ptrdiff_t next_sums_of_product_avx2(ColumnStep step, const float* above, float* sums,
+                                    RowPointers entering, RowPointers leaving, ptrdiff_t width);
+ptrdiff_t next_sums_of_product_avx512(ColumnStep step, const float* above, float* sums,
+                                      RowPointers entering, RowPointers leaving, ptrdiff_t width);
+// values[x] /= divisor; each returns the first value that it did not divide.
+int divide_by_avx2(float* values, int count, float divisor);
+int divide_by_avx512(float* values, int count, float divisor);
+#endif
 
 // The quantities that are averaged, by pixel index. `four` gives four neighbouring pixels.
 struct PlaneTerm {
   const float* plane;
 
   PlaneTerm from(ptrdiff_t offset) const { return {plane + offset}; }
+  RowPointers pointers() const { return {plane, nullptr}; }
+#if HAZE_X86
+  static auto* x86() { return x86_kernel(next_sums_of_plane_avx2, next_sums_of_plane_avx512); }
+#endif
   float operator()(ptrdiff_t i) const { return plane[i]; }
 #if HAZE_NEON
   float32x4_t four(ptrdiff_t i) const { return vld1q_f32(plane + i); }
@@ -28,6 +50,10 @@ struct ProductTerm {
   const float* second;
 
   ProductTerm from(ptrdiff_t offset) const { return {first + offset, second + offset}; }
+  RowPointers pointers() const { return {first, second}; }
+#if HAZE_X86
+  static auto* x86() { return x86_kernel(next_sums_of_product_avx2, next_sums_of_product_avx512); }
+#endif
   float operator()(ptrdiff_t i) const { return first[i] * second[i]; }
 #if HAZE_NEON
   float32x4_t four(ptrdiff_t i) const {
@@ -115,6 +141,9 @@ inline void add_row(const float* above, float* sums, Term row, ptrdiff_t width) 
   ptrdiff_t x = 0;
 #if HAZE_NEON
   x = add_row_neon(above, sums, row, width);
+#elif HAZE_X86
+  if (const auto kernel = Term::x86())
+    x = kernel(ColumnStep::kEnter, above, sums, row.pointers(), {}, width);
 #endif
   add_row_portable(above, sums, row, x, width);
 }
@@ -124,6 +153,9 @@ inline void subtract_row(const float* above, float* sums, Term row, ptrdiff_t wi
   ptrdiff_t x = 0;
 #if HAZE_NEON
   x = subtract_row_neon(above, sums, row, width);
+#elif HAZE_X86
+  if (const auto kernel = Term::x86())
+    x = kernel(ColumnStep::kLeave, above, sums, {}, row.pointers(), width);
 #endif
   subtract_row_portable(above, sums, row, x, width);
 }
@@ -134,13 +166,21 @@ inline void slide_rows(const float* above, float* sums, Term entering, Term leav
   ptrdiff_t x = 0;
 #if HAZE_NEON
   x = slide_rows_neon(above, sums, entering, leaving, width);
+#elif HAZE_X86
+  if (const auto kernel = Term::x86())
+    x = kernel(ColumnStep::kSlide, above, sums, entering.pointers(), leaving.pointers(), width);
 #endif
   slide_rows_portable(above, sums, entering, leaving, x, width);
 }
 
 // values[x] /= divisor
 inline void divide_by(float* values, int count, float divisor) {
-  for (int x = 0; x < count; ++x) values[x] /= divisor;
+  int x = 0;
+#if HAZE_X86
+  if (const auto kernel = x86_kernel(divide_by_avx2, divide_by_avx512))
+    x = kernel(values, count, divisor);
+#endif
+  for (; x < count; ++x) values[x] /= divisor;
 }
 
 // kRows neighbouring output rows: their column sums, their means, and how many rows each of their

@@ -16,18 +16,33 @@
 #include <stdint.h>
 #include <string.h>
 
+#include "core/cpu_level.h"
 #include "core/numeric.h"
 #include "core/scratch.h"
 #include "core/target.h"
 
 namespace haze::filter {
 
+#if HAZE_X86
+// The vector part of combine_lines; each returns the first sample that it did not write.
+size_t combine_least_bytes_avx2(const uint8_t* earlier, const uint8_t* later, uint8_t* to,
+                                size_t count);
+size_t combine_least_bytes_avx512(const uint8_t* earlier, const uint8_t* later, uint8_t* to,
+                                  size_t count);
+size_t combine_most_floats_avx2(const float* earlier, const float* later, float* to, size_t count);
+size_t combine_most_floats_avx512(const float* earlier, const float* later, float* to,
+                                  size_t count);
+#endif
+
 // Neutral is what samples beyond the image count as. Of equal samples the later one is taken, which
 // matters for zeros of different sign.
 struct LeastByte {
   using Value = uint8_t;
   static constexpr Value kNeutral = 255;
-  static Value combine(Value earlier, Value later) { return later <= earlier ? later : earlier; }
+  static Value combine(Value earlier, Value later) { return earlier < later ? earlier : later; }
+#if HAZE_X86
+  static auto* x86() { return x86_kernel(combine_least_bytes_avx2, combine_least_bytes_avx512); }
+#endif
 #if HAZE_NEON
   static constexpr size_t kLanes = 16;
   static void combine_lanes(const Value* earlier, const Value* later, Value* to) {
@@ -39,7 +54,10 @@ struct LeastByte {
 struct MostFloat {
   using Value = float;
   static constexpr Value kNeutral = -__builtin_inff();
-  static Value combine(Value earlier, Value later) { return later >= earlier ? later : earlier; }
+  static Value combine(Value earlier, Value later) { return earlier > later ? earlier : later; }
+#if HAZE_X86
+  static auto* x86() { return x86_kernel(combine_most_floats_avx2, combine_most_floats_avx512); }
+#endif
 #if HAZE_NEON
   static constexpr size_t kLanes = 4;
   static void combine_lanes(const Value* earlier, const Value* later, Value* to) {
@@ -59,6 +77,8 @@ inline void combine_lines(const typename Extremum::Value* earlier,
 #if HAZE_NEON
   for (; i + Extremum::kLanes <= count; i += Extremum::kLanes)
     Extremum::combine_lanes(earlier + i, later + i, to + i);
+#elif HAZE_X86
+  if (const auto kernel = Extremum::x86()) i = kernel(earlier, later, to, count);
 #endif
   for (; i < count; ++i) to[i] = Extremum::combine(earlier[i], later[i]);
 }
@@ -156,11 +176,12 @@ inline bool filter_rows(const typename Extremum::Value* src, typename Extremum::
   return true;
 }
 
-// All columns, in bundles that fill a cache line.
+// All columns, in bundles of a few cache lines: wide enough to read whole lines, narrow enough to
+// stay in the second-level cache.
 template <typename Extremum>
 inline bool filter_columns(const typename Extremum::Value* src, typename Extremum::Value* dst,
                            int width, int height, ptrdiff_t stride, int radius) {
-  constexpr int kBundle = 64 / sizeof(typename Extremum::Value);
+  constexpr int kBundle = 512 / sizeof(typename Extremum::Value);
   if (width < 1 || height < 1 || radius < 0) return false;
   WindowLines<Extremum> columns(height, radius, min(kBundle, width));
   if (!columns) return false;

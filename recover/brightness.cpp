@@ -5,6 +5,7 @@
 
 #include "core/image_size.h"
 #include "haze_preview.h"
+#include "recover/brightness_kernels.h"
 
 namespace {
 
@@ -24,5 +25,5 @@ void ImproveBrightnessPreview(unsigned char* buf, int w, int h) {
   if (count == 0) return;
   uint8_t table[256];
   for (int value = 0; value < 256; ++value) table[value] = lifted(value);
-  for (size_t i = 0; i < count; ++i) buf[2 * i] = table[buf[2 * i]];
+  haze::recover::look_up_first_bytes(buf, table, count);
 }
