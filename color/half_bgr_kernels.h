@@ -36,9 +36,11 @@ inline int half_bgr_row_neon(const uint8_t* luma, const uint8_t* vu, uint8_t* bg
     const uint8x8_t y = vld2_u8(luma + 2 * x).val[0];
     const uint8x8x2_t chroma = vld2_u8(vu + 2 * x);
     const ChannelOffsetsNeon offset = channel_offsets_neon(chroma.val[0], chroma.val[1], weights);
-    vst3_u8(bgr + 3 * x,
-            uint8x8x3_t{{add_clamped_neon(y, offset.blue), add_clamped_neon(y, offset.green),
-                         add_clamped_neon(y, offset.red)}});
+    // Named, since vst3_u8 may be a macro that takes the commas of an initialiser for its own.
+    const uint8x8x3_t pixels = {{add_clamped_neon(y, offset.blue),
+                                 add_clamped_neon(y, offset.green),
+                                 add_clamped_neon(y, offset.red)}};
+    vst3_u8(bgr + 3 * x, pixels);
   }
   return x;
 }

@@ -24,23 +24,24 @@ void average(const uint8_t* src, uint8_t* dst, int width, int height, Reach reac
   });
 }
 
-uint8_t divide_64(int32_t sum, int rows, int columns) {
+// Function objects, not functions: a call for every pixel would cost more than the mean.
+constexpr auto divide_64 = [](int32_t sum, int rows, int columns) {
   return Reciprocals64::divide(static_cast<uint32_t>(sum),
                                kReciprocals64.row(rows)[columns - kLeastCount]);
-}
+};
 
 // Exact for sums below 2^24 and counts up to 2^16: both convert without rounding, and a quotient
 // that is no integer stays at least 1 / count >= 2^-16 below the next one, which is a whole step of
 // a float under 256.
-uint8_t divide_small(int32_t sum, int rows, int columns) {
+constexpr auto divide_small = [](int32_t sum, int rows, int columns) {
   return static_cast<uint8_t>(static_cast<float>(sum) / static_cast<float>(rows * columns));
-}
+};
 
 // Double precision holds every sum and count of an image exactly, and its step under 256 is far
 // less than 1 / count. 32-bit ARM divides it in hardware, unlike 64-bit integers.
-uint8_t divide_large(double sum, int rows, int columns) {
+constexpr auto divide_large = [](double sum, int rows, int columns) {
   return static_cast<uint8_t>(sum / (static_cast<double>(rows) * columns));
-}
+};
 
 // Largest radius whose window sum, (2 * 127 + 1)^2 * 255, stays below 2^24.
 constexpr int kLargestSmallRadius = 127;
