@@ -21,7 +21,11 @@ inline int16x4_t channel_weights_neon() {
   static_assert(kBt601GreenFromCr % 2 == 0 && kBt601GreenFromCb % 2 == 0);
   const int16_t weights[4] = {kBt601BlueFromCb, kBt601RedFromCr, -kBt601GreenFromCr / 2,
                               -kBt601GreenFromCb / 2};
-  return vld1_s16(weights);
+  int16x4_t loaded = vld1_s16(weights);
+  // Opaque to Clang, which would otherwise spread the constants over whole registers, run out of
+  // them and load them again for every eight pixels.
+  __asm__("" : "+w"(loaded));
+  return loaded;
 }
 
 // channel_offsets of eight chroma pairs, bytes with their offset of 128.

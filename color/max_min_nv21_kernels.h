@@ -34,13 +34,17 @@ inline int max_min_row_neon(const uint8_t* luma, const uint8_t* chroma, uint8_t*
   const int16x4_t weights = channel_weights_neon();
   int x = 0;
   for (; x + 8 <= end; x += 8) {
-    const uint8x8_t y = vld2_u8(luma + 2 * x).val[0];
-    const uint8x8x2_t crcb = vld2_u8(chroma + 2 * x);
+    const uint8x8_t y = vld2_u8(luma).val[0];
+    const uint8x8x2_t crcb = vld2_u8(chroma);
     const ChannelOffsetsNeon offset = channel_offsets_neon(crcb.val[0], crcb.val[1], weights);
     const int16x8_t least = vminq_s16(offset.blue, vminq_s16(offset.green, offset.red));
     const int16x8_t most = vmaxq_s16(offset.blue, vmaxq_s16(offset.green, offset.red));
-    vst1_u8(min_out + x, add_clamped_neon(y, least));
-    vst1_u8(max_out + x, add_clamped_neon(y, most));
+    vst1_u8(min_out, add_clamped_neon(y, least));
+    vst1_u8(max_out, add_clamped_neon(y, most));
+    luma += 16;
+    chroma += 16;
+    min_out += 8;
+    max_out += 8;
   }
   return x;
 }
