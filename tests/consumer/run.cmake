@@ -1,7 +1,8 @@
 # Installs the build to a fresh prefix and builds a project against it, by the CMake package and by
 # pkg-config. Both programs must run and print the build's version.
 #
-#   cmake -DBUILD=build-folder -DSOURCE=project -DWORK=scratch -DCXX=c++ -DVERSION=x.y.z -P run.cmake
+#   cmake -DBUILD=build-folder -DSOURCE=project -DWORK=scratch -DCXX=c++
+#     -DGENERATOR=Ninja -DVERSION=x.y.z -P run.cmake
 
 set(prefix ${WORK}/prefix)
 file(REMOVE_RECURSE ${WORK})
@@ -25,7 +26,7 @@ file(GLOB_RECURSE pc_file ${prefix}/*/haze_preview.pc)
 cmake_path(GET pc_file PARENT_PATH pc_dir)
 cmake_path(GET pc_dir PARENT_PATH library_dir)
 
-run(${CMAKE_COMMAND} -S ${SOURCE} -B ${WORK}/cmake
+run(${CMAKE_COMMAND} -S ${SOURCE} -B ${WORK}/cmake -G ${GENERATOR}
   -DCMAKE_CXX_COMPILER=${CXX} -DCMAKE_PREFIX_PATH=${prefix})
 run(${CMAKE_COMMAND} --build ${WORK}/cmake)
 check_program(${WORK}/cmake/consumer)
