@@ -20,7 +20,7 @@ void run_frame(Bytes& frame, Size size, int parity) {
 
 void add_frame_cases(Size size, std::vector<Case>& cases) {
   const auto frame = shared(hazy_frame(size));
-  const auto original = frame ? shared(*frame) : nullptr;
+  const auto original = shared(*frame);
   const auto peer_frame = shared(*frame);
   const auto peer = std::make_shared<FastPipeline>(size);
   peer->estimate(*peer_frame);

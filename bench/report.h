@@ -17,8 +17,7 @@ class Report : public benchmark::BenchmarkReporter {
   bool ReportContext(const Context& context) override;
   void ReportRuns(const std::vector<Run>& runs) override;
 
-  // Prints one row per case, in order. `copy` names the benchmark that copies a frame of the case's
-  // size class.
+  // Prints one row per case, in order.
   void print_table(const std::vector<Case>& cases) const;
   bool write_json(const std::string& path, const std::vector<Case>& cases) const;
 
