@@ -99,6 +99,51 @@ struct Avx2 {
   static Int interleave_high16(Int a, Int b) { return _mm256_unpackhi_epi16(a, b); }
   static Int clamp16_by_lanes(Int low, Int high) { return _mm256_packus_epi16(low, high); }
 
+  static void split_bytes(Int bytes, Float (&quarters)[4]) {
+    const Int exponent = set16(0x4B00);
+    const Int low = _mm256_unpacklo_epi8(bytes, _mm256_setzero_si256());
+    const Int high = _mm256_unpackhi_epi8(bytes, _mm256_setzero_si256());
+    quarters[0] = _mm256_castsi256_ps(_mm256_unpacklo_epi16(low, exponent));
+    quarters[1] = _mm256_castsi256_ps(_mm256_unpackhi_epi16(low, exponent));
+    quarters[2] = _mm256_castsi256_ps(_mm256_unpacklo_epi16(high, exponent));
+    quarters[3] = _mm256_castsi256_ps(_mm256_unpackhi_epi16(high, exponent));
+  }
+  static Int join_clamped(const Int (&quarters)[4]) {
+    return _mm256_packus_epi16(_mm256_packs_epi32(quarters[0], quarters[1]),
+                               _mm256_packs_epi32(quarters[2], quarters[3]));
+  }
+  static void load_half(const uint8_t* from, Float& low, Float& high) {
+    const Int bytes = _mm256_permute4x64_epi64(
+        _mm256_castsi128_si256(_mm_loadu_si128(reinterpret_cast<const __m128i*>(from))),
+        0x50);  // 0, 0, 1, 1
+    const Int words = _mm256_unpacklo_epi8(bytes, _mm256_setzero_si256());
+    low = _mm256_castsi256_ps(_mm256_unpacklo_epi16(words, set16(0x4B00)));
+    high = _mm256_castsi256_ps(_mm256_unpackhi_epi16(words, set16(0x4B00)));
+  }
+  static void order_half(Float& low, Float& high) {
+    const Float first = low;
+    low = _mm256_permute2f128_ps(first, high, 0x20);
+    high = _mm256_permute2f128_ps(first, high, 0x31);
+  }
+  static void split_pairs(Float a_low, Float a_high, Float b_low, Float b_high,
+                          Float (&quarters)[4]) {
+    quarters[0] = _mm256_unpacklo_ps(a_low, b_low);
+    quarters[1] = _mm256_unpackhi_ps(a_low, b_low);
+    quarters[2] = _mm256_unpacklo_ps(a_high, b_high);
+    quarters[3] = _mm256_unpackhi_ps(a_high, b_high);
+  }
+  template <int kQuarter>
+  static Float split_group(Float a, Float b) {
+    return _mm256_blend_ps(_mm256_permute_ps(a, kQuarter * 0x55),
+                           _mm256_permute_ps(b, kQuarter * 0x55), 0x44);
+  }
+  static Int load_in_turn(const uint8_t* first, const uint8_t* second) {
+    return bit_or(load_bytes16(first), shift_left16<8>(load_bytes16(second)));
+  }
+  static void store_in_turn(uint8_t* first, uint8_t* second, Int a) {
+    store_halves(first, second, clamp16(bit_and(a, set16(0x00FF)), _mm256_srli_epi16(a, 8)));
+  }
+
   // Each 128-bit lane holds sixteen pixels in three chunks of sixteen bytes. At offset o of chunk c
   // stands channel (c + o) % 3, so a channel is picked from the chunks by offset alone and then put
   // in order within the lane.
@@ -127,17 +172,6 @@ struct Avx2 {
   }
   static void store_floats(float* to, Float a) { _mm256_storeu_ps(to, a); }
   static Float load_floats(const float* from) { return _mm256_loadu_ps(from); }
-  static Float interleave_low(Float a, Float b) {
-    return _mm256_permute2f128_ps(_mm256_unpacklo_ps(a, b), _mm256_unpackhi_ps(a, b), 0x20);
-  }
-  static Float interleave_high(Float a, Float b) {
-    return _mm256_permute2f128_ps(_mm256_unpacklo_ps(a, b), _mm256_unpackhi_ps(a, b), 0x31);
-  }
-  static Float spread_quarter(Float a, Float b, int quarter) {
-    const Int order = add32(_mm256_setr_epi32(0, 0, 0, 0, 1, 1, 1, 1), set32(2 * quarter));
-    return _mm256_blend_ps(_mm256_permutevar8x32_ps(a, order), _mm256_permutevar8x32_ps(b, order),
-                           0x44);
-  }
   static Float set_four(float a, float b, float c, float d) {
     return _mm256_setr_ps(a, b, c, d, a, b, c, d);
   }
@@ -159,28 +193,31 @@ struct Avx2 {
   static Float max(Float a, Float b) { return _mm256_max_ps(a, b); }
   static Float to_float(Int a) { return _mm256_cvtepi32_ps(a); }
   static Int truncate(Float a) { return _mm256_cvttps_epi32(a); }
-  static Float repeat_low(Float a) {
-    return _mm256_permutevar8x32_ps(a, _mm256_setr_epi32(0, 0, 1, 1, 2, 2, 3, 3));
-  }
-  static Float repeat_high(Float a) {
-    return _mm256_permutevar8x32_ps(a, _mm256_setr_epi32(4, 4, 5, 5, 6, 6, 7, 7));
+  static Float whole_part(Float a) {
+    return _mm256_round_ps(a, _MM_FROUND_TO_ZERO | _MM_FROUND_NO_EXC);
   }
 
-  // A table of 256 bytes as sixteen of 16. A byte shuffle gives 0 where bit 7 of the index is set;
-  // adding 0x70 with saturation sets it for every byte outside 0 ... 15 and leaves the lower bits
-  // of the others, so each table answers for its own range alone.
+  // A table of 256 bytes as sixteen of 16: all are looked up at the lower half of the index, and
+  // its upper four bits choose between neighbours, then between pairs, and so on.
   struct Table {
     explicit Table(const uint8_t* table_bytes) : bytes(table_bytes) {}
 
     Int operator[](Int index) const {
-      Int result = _mm256_setzero_si256();
-      for (int range = 0; range < 16; ++range) {
-        const Int sixteen = _mm256_broadcastsi128_si256(
-            _mm_loadu_si128(reinterpret_cast<const __m128i*>(bytes + 16 * range)));
-        const Int own = _mm256_adds_epu8(_mm256_sub_epi8(index, set8(16 * range)), set8(0x70));
-        result = _mm256_or_si256(result, _mm256_shuffle_epi8(sixteen, own));
-      }
-      return result;
+      const Int low_half = bit_and(index, set8(0x0F));
+      // A bit to choose by has to be the highest of its byte.
+      const Int bit4 = shift_left16<3>(index);
+      const Int bit5 = shift_left16<2>(index);
+      const Int bit6 = shift_left16<1>(index);
+      const auto sixteen = [&](int range) {
+        return _mm256_shuffle_epi8(repeat_lane(bytes + 16 * range), low_half);
+      };
+      const auto sixty_four = [&](int range) {
+        return _mm256_blendv_epi8(_mm256_blendv_epi8(sixteen(range), sixteen(range + 1), bit4),
+                                  _mm256_blendv_epi8(sixteen(range + 2), sixteen(range + 3), bit4),
+                                  bit5);
+      };
+      return _mm256_blendv_epi8(_mm256_blendv_epi8(sixty_four(0), sixty_four(4), bit6),
+                                _mm256_blendv_epi8(sixty_four(8), sixty_four(12), bit6), index);
     }
 
     const uint8_t* bytes;
@@ -210,7 +247,9 @@ struct Avx2 {
         _mm256_castsi128_si256(_mm_loadu_si128(reinterpret_cast<const __m128i*>(low))),
         _mm_loadu_si128(reinterpret_cast<const __m128i*>(high)), 1);
   }
-  static Int repeat_lane(const uint8_t* bytes) { return load_lanes(bytes, bytes); }
+  static Int repeat_lane(const uint8_t* bytes) {
+    return _mm256_broadcastsi128_si256(_mm_loadu_si128(reinterpret_cast<const __m128i*>(bytes)));
+  }
   // Bytes of a, b and c at the offsets 0, 1 and 2 modulo 3 of each lane.
   static Int pick(Int a, Int b, Int c) {
     const Int second = _mm256_setr_epi8(0, -1, 0, 0, -1, 0, 0, -1, 0, 0, -1, 0, 0, -1, 0, 0, 0, -1,

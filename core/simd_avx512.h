@@ -15,10 +15,6 @@ struct Avx512 {
 
   static Int load(const void* from) { return _mm512_loadu_si512(from); }
   static void store(void* to, Int a) { _mm512_storeu_si512(to, a); }
-  static void store_halves(void* low, void* high, Int a) {
-    _mm256_storeu_si256(static_cast<__m256i*>(low), _mm512_castsi512_si256(a));
-    _mm256_storeu_si256(static_cast<__m256i*>(high), _mm512_extracti64x4_epi64(a, 1));
-  }
 
   static Int set8(int a) { return _mm512_set1_epi8(static_cast<char>(a)); }
   static Int set16(int a) { return _mm512_set1_epi16(static_cast<short>(a)); }
@@ -106,6 +102,63 @@ struct Avx512 {
   // 16-bit values as bytes clamped to 0 ... 255, by 128-bit lanes.
   static Int clamp16_by_lanes(Int low, Int high) { return _mm512_packus_epi16(low, high); }
 
+  // The bytes as floats by 128-bit lanes: quarter q takes the bytes 4 q ... 4 q + 3 of each lane.
+  // They come as 2^23 + byte, which is what a byte below the exponent of 2^23 means.
+  static void split_bytes(Int bytes, Float (&quarters)[4]) {
+    const Int exponent = set16(0x4B00);
+    const Int low = _mm512_unpacklo_epi8(bytes, _mm512_setzero_si512());
+    const Int high = _mm512_unpackhi_epi8(bytes, _mm512_setzero_si512());
+    quarters[0] = _mm512_castsi512_ps(_mm512_unpacklo_epi16(low, exponent));
+    quarters[1] = _mm512_castsi512_ps(_mm512_unpackhi_epi16(low, exponent));
+    quarters[2] = _mm512_castsi512_ps(_mm512_unpacklo_epi16(high, exponent));
+    quarters[3] = _mm512_castsi512_ps(_mm512_unpackhi_epi16(high, exponent));
+  }
+  // 32-bit values of such quarters back as bytes, clamped to 0 ... 255. Values beyond 16 bits clamp
+  // as well.
+  static Int join_clamped(const Int (&quarters)[4]) {
+    return _mm512_packus_epi16(_mm512_packs_epi32(quarters[0], quarters[1]),
+                               _mm512_packs_epi32(quarters[2], quarters[3]));
+  }
+  // kBytes / 2 bytes as 2^23 + byte in the order of split_pairs.
+  static void load_half(const uint8_t* from, Float& low, Float& high) {
+    const Int bytes = _mm512_permutexvar_epi64(
+        _mm512_setr_epi64(0, 0, 1, 1, 2, 2, 3, 3),
+        _mm512_castsi256_si512(_mm256_loadu_si256(reinterpret_cast<const __m256i*>(from))));
+    const Int words = _mm512_unpacklo_epi8(bytes, _mm512_setzero_si512());
+    low = _mm512_castsi512_ps(_mm512_unpacklo_epi16(words, set16(0x4B00)));
+    high = _mm512_castsi512_ps(_mm512_unpackhi_epi16(words, set16(0x4B00)));
+  }
+  // Two vectors of consecutive values in the order of split_pairs.
+  static void order_half(Float& low, Float& high) {
+    const Float first = low;
+    low = _mm512_shuffle_f32x4(first, high, 0x88);   // lanes 0 and 2 of each
+    high = _mm512_shuffle_f32x4(first, high, 0xDD);  // lanes 1 and 3
+  }
+  // One value each of a and of b for every pair of bytes that split_bytes takes apart. Lane j of
+  // `low` holds the values 8 j ... 8 j + 3, of `high` 8 j + 4 ... 8 j + 7.
+  static void split_pairs(Float a_low, Float a_high, Float b_low, Float b_high,
+                          Float (&quarters)[4]) {
+    quarters[0] = _mm512_unpacklo_ps(a_low, b_low);
+    quarters[1] = _mm512_unpackhi_ps(a_low, b_low);
+    quarters[2] = _mm512_unpacklo_ps(a_high, b_high);
+    quarters[3] = _mm512_unpackhi_ps(a_high, b_high);
+  }
+  // Quarter of the values for groups of four bytes: a, a, b, a.
+  template <int kQuarter>
+  static Float split_group(Float a, Float b) {
+    return _mm512_mask_permute_ps(_mm512_permute_ps(a, kQuarter * 0x55), 0x4444, b,
+                                  kQuarter * 0x55);
+  }
+  // kBytes / 2 bytes of two planes each in turn, and back.
+  static Int load_in_turn(const uint8_t* first, const uint8_t* second) {
+    return bit_or(load_bytes16(first), shift_left16<8>(load_bytes16(second)));
+  }
+  static void store_in_turn(uint8_t* first, uint8_t* second, Int a) {
+    _mm256_storeu_si256(reinterpret_cast<__m256i*>(first), _mm512_cvtepi16_epi8(a));
+    _mm256_storeu_si256(reinterpret_cast<__m256i*>(second),
+                        _mm512_cvtepi16_epi8(_mm512_srli_epi16(a, 8)));
+  }
+
   // kBytes pixels of three bytes as three vectors, and back.
   static void load_three(const uint8_t* from, Int (&channels)[3]) {
     const Int a = load(from);
@@ -139,21 +192,6 @@ struct Avx512 {
   }
   static void store_floats(float* to, Float a) { _mm512_storeu_ps(to, a); }
   static Float load_floats(const float* from) { return _mm512_loadu_ps(from); }
-  // Lanes of a and b in turn, a first: the first half and the second half.
-  static Float interleave_low(Float a, Float b) {
-    return _mm512_permutex2var_ps(
-        a, _mm512_setr_epi32(0, 16, 1, 17, 2, 18, 3, 19, 4, 20, 5, 21, 6, 22, 7, 23), b);
-  }
-  static Float interleave_high(Float a, Float b) {
-    return _mm512_permutex2var_ps(
-        a, _mm512_setr_epi32(8, 24, 9, 25, 10, 26, 11, 27, 12, 28, 13, 29, 14, 30, 15, 31), b);
-  }
-  // Lanes 4 j ... 4 j + 3: a, a, b, a of lane j of the given quarter.
-  static Float spread_quarter(Float a, Float b, int quarter) {
-    const Int order = add32(_mm512_setr_epi32(0, 0, 16, 0, 1, 1, 17, 1, 2, 2, 18, 2, 3, 3, 19, 3),
-                            set32(4 * quarter));
-    return _mm512_permutex2var_ps(a, order, b);
-  }
   static Float set_four(float a, float b, float c, float d) { return _mm512_setr4_ps(a, b, c, d); }
   static Float add(Float a, Float b) { return _mm512_add_ps(a, b); }
   static Float sub(Float a, Float b) { return _mm512_sub_ps(a, b); }
@@ -176,14 +214,9 @@ struct Avx512 {
   static Float to_float(Int a) { return _mm512_cvtepi32_ps(a); }
   // Truncated; what is not a number becomes the least integer.
   static Int truncate(Float a) { return _mm512_cvttps_epi32(a); }
-  // The lower or the upper half of the lanes, each twice.
-  static Float repeat_low(Float a) {
-    return _mm512_permutexvar_ps(_mm512_setr_epi32(0, 0, 1, 1, 2, 2, 3, 3, 4, 4, 5, 5, 6, 6, 7, 7),
-                                 a);
-  }
-  static Float repeat_high(Float a) {
-    return _mm512_permutexvar_ps(
-        _mm512_setr_epi32(8, 8, 9, 9, 10, 10, 11, 11, 12, 12, 13, 13, 14, 14, 15, 15), a);
+  // Whole part of a value that is not negative.
+  static Float whole_part(Float a) {
+    return _mm512_roundscale_ps(a, _MM_FROUND_TO_ZERO | _MM_FROUND_NO_EXC);
   }
 
   // A table of 256 bytes in registers.

@@ -20,9 +20,8 @@ namespace haze::recover {
 template <typename V>
 typename V::Float reciprocals_of(typename V::Float scaled) {
   const typename V::Float cut = V::min(V::set_float(255.0f), V::max(scaled, V::set_float(0.0f)));
-  const typename V::Float index = V::to_float(V::truncate(cut));
-  return V::to_float(
-      V::truncate(V::div(V::set_float(65536.0f), V::max(V::set_float(1.0f), index))));
+  const typename V::Float index = V::max(V::set_float(1.0f), V::whole_part(cut));
+  return V::whole_part(V::div(V::set_float(65536.0f), index));
 }
 
 // Reciprocals of one vector of blocks for each place in a block, see block_indices.h.
@@ -55,6 +54,14 @@ struct BlockReciprocals {
     below = V::mul(below, unit);
     diagonal = V::mul(diagonal, unit);
   }
+
+  // Puts two vectors of blocks in the order of V::split_pairs.
+  static void order(BlockReciprocals& low, BlockReciprocals& high) {
+    V::order_half(low.anchor, high.anchor);
+    V::order_half(low.right, high.right);
+    V::order_half(low.below, high.below);
+    V::order_half(low.diagonal, high.diagonal);
+  }
 };
 
 // Every sample of a row of 2 x 2 blocks of a planar frame; returns the first block that it did not
@@ -62,10 +69,11 @@ struct BlockReciprocals {
 template <typename V, bool kInteger>
 int recover_every_pixel_x86(BlockRow row, const float* t, const float* next_t, int blocks,
                             FloatAnchor anchor, const uint8_t* tone_curve) {
-  using How = std::conditional_t<kInteger, ByReciprocal<V>, ByFactor<V>>;
+  using How = std::conditional_t<kInteger, ByReciprocal<V>, ByFactorAnyAnchor<V>>;
   using Float = typename V::Float;
   const typename V::Table brightened(tone_curve);
-  const Float y = V::set_float(anchor.y);
+  const How luma = {V::set_float(anchor.y)};
+  const How chroma = {V::set_alternating(anchor.v, anchor.u)};
   int x = 0;
   for (; x + V::kBytes / 2 < blocks; x += V::kBytes / 2) {
     BlockReciprocals<V> low(t + x, next_t + x);
@@ -74,21 +82,33 @@ int recover_every_pixel_x86(BlockRow row, const float* t, const float* next_t, i
       low.scale();
       high.scale();
     }
-    const Float top_factors[4] = {
-        V::interleave_low(low.anchor, low.right), V::interleave_high(low.anchor, low.right),
-        V::interleave_low(high.anchor, high.right), V::interleave_high(high.anchor, high.right)};
-    const Float bottom_factors[4] = {V::interleave_low(low.below, low.diagonal),
-                                     V::interleave_high(low.below, low.diagonal),
-                                     V::interleave_low(high.below, high.diagonal),
-                                     V::interleave_high(high.below, high.diagonal)};
+    BlockReciprocals<V>::order(low, high);
+    Float top_factors[4];
+    Float bottom_factors[4];
+    Float block_factors[4];
+    V::split_pairs(low.anchor, high.anchor, low.right, high.right, top_factors);
+    V::split_pairs(low.below, high.below, low.diagonal, high.diagonal, bottom_factors);
+    V::split_pairs(low.anchor, high.anchor, low.anchor, high.anchor, block_factors);
     uint8_t* const top = row.luma_top + 2 * x;
     uint8_t* const bottom = row.luma_bottom + 2 * x;
-    V::store(top, brightened[recovered_row<V, How>(top, y, top_factors)]);
-    V::store(bottom, brightened[recovered_row<V, How>(bottom, y, bottom_factors)]);
-    recover_two_planes<V, How>(row.v + x, V::set_float(anchor.v), row.u + x, V::set_float(anchor.u),
-                               low.anchor, high.anchor);
+    const typename V::Int vu = V::load_in_turn(row.v + x, row.u + x);
+    V::store(top, brightened[recovered<V>(V::load(top), luma, top_factors)]);
+    V::store(bottom, brightened[recovered<V>(V::load(bottom), luma, bottom_factors)]);
+    V::store_in_turn(row.v + x, row.u + x, recovered<V>(vu, chroma, block_factors));
   }
   return x;
+}
+
+// Reciprocals of kBytes / 2 blocks, for every pair of samples that lies in a block.
+template <typename V>
+void block_reciprocals(const float* t, typename V::Float (&quarters)[4]) {
+  const typename V::Float scale = V::set_float(255.0f);
+  typename V::Float low = V::load_floats(t);
+  typename V::Float high = V::load_floats(t + V::kFloats);
+  V::order_half(low, high);
+  low = reciprocals_of<V>(V::mul(low, scale));
+  high = reciprocals_of<V>(V::mul(high, scale));
+  V::split_pairs(low, high, low, high, quarters);
 }
 
 // The top-left luma of each block, the other luma left alone; returns the first block that it did
@@ -96,21 +116,17 @@ int recover_every_pixel_x86(BlockRow row, const float* t, const float* next_t, i
 template <typename V>
 int recover_anchors_x86(uint8_t* luma, const float* t, int blocks, float anchor,
                         const uint8_t* tone_curve) {
-  using Float = typename V::Float;
   using Int = typename V::Int;
   const typename V::Table brightened(tone_curve);
-  const Float scale = V::set_float(255.0f);
+  const ByReciprocal<V> how = {V::set_float(anchor)};
   int x = 0;
   for (; x + V::kBytes / 2 <= blocks; x += V::kBytes / 2) {
-    const Float low = reciprocals_of<V>(V::mul(V::load_floats(t + x), scale));
-    const Float high = reciprocals_of<V>(V::mul(V::load_floats(t + x + V::kFloats), scale));
-    const Float pairs[4] = {V::repeat_low(low), V::repeat_high(low), V::repeat_low(high),
-                            V::repeat_high(high)};
-    uint8_t* const samples = luma + 2 * x;
-    const Int recovered =
-        brightened[recovered_row<V, ByReciprocal<V>>(samples, V::set_float(anchor), pairs)];
-    V::store(samples, V::bit_or(V::bit_and(recovered, V::set16(0x00FF)),
-                                V::bit_and(V::load(samples), V::set16(0xFF00))));
+    typename V::Float k[4];
+    block_reciprocals<V>(t + x, k);
+    const Int samples = V::load(luma + 2 * x);
+    const Int bright = brightened[recovered<V>(samples, how, k)];
+    V::store(luma + 2 * x, V::bit_or(V::bit_and(bright, V::set16(0x00FF)),
+                                     V::bit_and(samples, V::set16(0xFF00))));
   }
   return x;
 }
@@ -121,10 +137,9 @@ int recover_anchors_x86(uint8_t* luma, const float* t, int blocks, float anchor,
 template <typename V>
 int fill_between_anchors_x86(BlockRow row, const uint8_t* next, const float* t, int blocks,
                              FloatAnchor anchor) {
-  using Float = typename V::Float;
   using Int = typename V::Int;
   const Int even = V::set16(0x00FF);
-  const Float scale = V::set_float(255.0f);
+  const ByReciprocal<V> chroma = {V::set_alternating(anchor.v, anchor.u)};
   int x = 0;
   // The neighbours of a step reach one luma pair beyond it.
   for (; x + V::kBytes / 2 < blocks; x += V::kBytes / 2) {
@@ -138,10 +153,10 @@ int fill_between_anchors_x86(BlockRow row, const uint8_t* next, const float* t, 
         V::template shift_right16<2>(V::add16(V::add16(here, right), V::add16(below, below_right)));
     V::store(row.luma_top + 2 * x, V::bit_or(here, V::template shift_left16<8>(top_mean)));
     V::store(row.luma_bottom + 2 * x, V::bit_or(left_mean, V::template shift_left16<8>(mean)));
-    recover_two_planes<V, ByReciprocal<V>>(
-        row.v + x, V::set_float(anchor.v), row.u + x, V::set_float(anchor.u),
-        reciprocals_of<V>(V::mul(V::load_floats(t + x), scale)),
-        reciprocals_of<V>(V::mul(V::load_floats(t + x + V::kFloats), scale)));
+    typename V::Float k[4];
+    block_reciprocals<V>(t + x, k);
+    const Int vu = V::load_in_turn(row.v + x, row.u + x);
+    V::store_in_turn(row.v + x, row.u + x, recovered<V>(vu, chroma, k));
   }
   return x;
 }
@@ -156,22 +171,23 @@ int recover_packed_rows_x86(const uint8_t* src, uint8_t* dst, ptrdiff_t row_byte
   using Float = typename V::Float;
   using Int = typename V::Int;
   const typename V::Table brightened(tone_curve);
-  const Float anchors = V::set_four(anchor.y, anchor.v, anchor.y, anchor.u);
+  const ByReciprocal<V> how = {V::set_four(anchor.y, anchor.v, anchor.y, anchor.u)};
   const Int luma_bytes = V::set16(0x00FF);
   const Int chroma_bytes = V::set16(0xFF00);
   int x = 0;
   for (; x + V::kFloats < blocks; x += V::kFloats) {
     const BlockReciprocals<V> k(t + x, next_t + x);
-    Float top_factors[4];
-    Float bottom_factors[4];
-    for (int quarter = 0; quarter < 4; ++quarter) {
-      top_factors[quarter] = V::spread_quarter(k.anchor, k.right, quarter);
-      bottom_factors[quarter] = V::spread_quarter(k.below, k.diagonal, quarter);
-    }
+    const Float top_factors[4] = {V::template split_group<0>(k.anchor, k.right),
+                                  V::template split_group<1>(k.anchor, k.right),
+                                  V::template split_group<2>(k.anchor, k.right),
+                                  V::template split_group<3>(k.anchor, k.right)};
+    const Float bottom_factors[4] = {V::template split_group<0>(k.below, k.diagonal),
+                                     V::template split_group<1>(k.below, k.diagonal),
+                                     V::template split_group<2>(k.below, k.diagonal),
+                                     V::template split_group<3>(k.below, k.diagonal)};
     const ptrdiff_t offset = 4 * static_cast<ptrdiff_t>(x);
-    const Int top = recovered_row<V, ByReciprocal<V>>(src + offset, anchors, top_factors);
-    const Int bottom =
-        recovered_row<V, ByReciprocal<V>>(src + row_bytes + offset, anchors, bottom_factors);
+    const Int top = recovered<V>(V::load(src + offset), how, top_factors);
+    const Int bottom = recovered<V>(V::load(src + row_bytes + offset), how, bottom_factors);
     const Int chroma = V::bit_and(top, chroma_bytes);
     V::store(dst + offset, V::bit_or(V::bit_and(brightened[top], luma_bytes), chroma));
     V::store(dst + row_bytes + offset,
