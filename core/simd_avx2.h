@@ -48,6 +48,10 @@ struct Avx2 {
     return _mm256_srai_epi16(a, kBits);
   }
   template <int kBits>
+  static Int shift_left32(Int a) {
+    return _mm256_slli_epi32(a, kBits);
+  }
+  template <int kBits>
   static Int shift_right32(Int a) {
     return _mm256_srai_epi32(a, kBits);
   }
@@ -68,10 +72,6 @@ struct Avx2 {
   static Int load_bytes16(const uint8_t* from) {
     return _mm256_cvtepu8_epi16(_mm_loadu_si128(reinterpret_cast<const __m128i*>(from)));
   }
-  static Int load32(const int16_t* from) {
-    return _mm256_cvtepi16_epi32(_mm_loadu_si128(reinterpret_cast<const __m128i*>(from)));
-  }
-  static Int load32(const int32_t* from) { return load(from); }
   static Int sub16(Int a, Int b) { return _mm256_sub_epi16(a, b); }
   static Int sub32(Int a, Int b) { return _mm256_sub_epi32(a, b); }
   static Int running_sums32(Int a) {
@@ -82,14 +82,9 @@ struct Avx2 {
     return add32(a, _mm256_blend_epi32(_mm256_setzero_si256(), total, 0xF0));
   }
   static Int repeat_last32(Int a) { return _mm256_permutevar8x32_epi32(a, set32(7)); }
-  static int first32(Int a) { return _mm_cvtsi128_si32(_mm256_castsi256_si128(a)); }
-  static void store_low_bytes32(uint8_t* to, Int a) {
-    const Int low_bytes =
-        _mm256_setr_epi8(0, 4, 8, 12, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1, 0, 4, 8, 12,
-                         -1, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1, -1);
-    const Int bytes = _mm256_permutevar8x32_epi32(_mm256_shuffle_epi8(a, low_bytes),
-                                                  _mm256_setr_epi32(0, 4, 0, 4, 0, 4, 0, 4));
-    _mm_storel_epi64(reinterpret_cast<__m128i*>(to), _mm256_castsi256_si128(bytes));
+  static void store_low_halves32(void* to, Int a) {
+    const Int halves = _mm256_permute4x64_epi64(_mm256_packus_epi32(a, a), 0x08);  // 0, 2
+    _mm_storeu_si128(static_cast<__m128i*>(to), _mm256_castsi256_si128(halves));
   }
 
   static Int min8u(Int a, Int b) { return _mm256_min_epu8(a, b); }

@@ -45,6 +45,10 @@ struct Avx512 {
     return _mm512_srai_epi16(a, kBits);
   }
   template <int kBits>
+  static Int shift_left32(Int a) {
+    return _mm512_slli_epi32(a, kBits);
+  }
+  template <int kBits>
   static Int shift_right32(Int a) {
     return _mm512_srai_epi32(a, kBits);
   }
@@ -68,14 +72,10 @@ struct Avx512 {
         order, _mm512_packus_epi16(_mm512_packs_epi32(a[0], a[1]), _mm512_packs_epi32(a[2], a[3])));
   }
 
-  // Bytes as 16-bit values; 16-bit values as 32-bit ones.
+  // Bytes as 16-bit values.
   static Int load_bytes16(const uint8_t* from) {
     return _mm512_cvtepu8_epi16(_mm256_loadu_si256(reinterpret_cast<const __m256i*>(from)));
   }
-  static Int load32(const int16_t* from) {
-    return _mm512_cvtepi16_epi32(_mm256_loadu_si256(reinterpret_cast<const __m256i*>(from)));
-  }
-  static Int load32(const int32_t* from) { return load(from); }
   static Int sub16(Int a, Int b) { return _mm512_sub_epi16(a, b); }
   static Int sub32(Int a, Int b) { return _mm512_sub_epi32(a, b); }
   // Each lane plus all lanes below it.
@@ -87,10 +87,9 @@ struct Avx512 {
     return add32(a, _mm512_alignr_epi32(a, zero, 8));
   }
   static Int repeat_last32(Int a) { return _mm512_permutexvar_epi32(set32(15), a); }
-  static int first32(Int a) { return _mm_cvtsi128_si32(_mm512_castsi512_si128(a)); }
-  // The low bytes of 32-bit values.
-  static void store_low_bytes32(uint8_t* to, Int a) {
-    _mm_storeu_si128(reinterpret_cast<__m128i*>(to), _mm512_cvtepi32_epi8(a));
+  // The low halves of 32-bit values, which are below 2^16.
+  static void store_low_halves32(void* to, Int a) {
+    _mm256_storeu_si256(static_cast<__m256i*>(to), _mm512_cvtepi32_epi16(a));
   }
 
   static Int min8u(Int a, Int b) { return _mm512_min_epu8(a, b); }

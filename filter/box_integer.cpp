@@ -1,5 +1,7 @@
 // Mean filters of 8-bit images by running sums: each output costs the same for every window size.
+#include <stddef.h>
 #include <stdint.h>
+#include <string.h>
 
 #include "core/image_size.h"
 #include "filter/box_integer_kernels.h"
@@ -11,13 +13,39 @@ namespace {
 using haze::filter::kLeastCount;
 using haze::filter::kReciprocals64;
 using haze::filter::kWindow;
+using haze::filter::PrefixRow;
 using haze::filter::Reach;
 using haze::filter::Reciprocals64;
+
+#if HAZE_X86
+// Means of the windows of `reach` by prefix sums, in vectors. In a function of its own for the sake of the stack: a row's
+// working memory takes some 46 KiB.
+template <typename Sum, typename Kernel>
+__attribute__((noinline)) void average_by_prefixes(const uint8_t* src, uint8_t* dst, int width,
+                                                   int height, Reach reach, Sum* scratch,
+                                                   Kernel* mean_row) {
+  PrefixRow prefix_row(width, reach);
+  haze::filter::sweep_columns(src, width, height, reach, prefix_row.column_sums,
+                              [&](int y, int rows) {
+                                mean_row(prefix_row, rows);
+                                memcpy(dst + static_cast<ptrdiff_t>(y) * width, prefix_row.means,
+                                       static_cast<size_t>(width));
+                              });
+  for (int x = 0; x < width; ++x) scratch[x] = prefix_row.column_sums[x];
+}
+#endif
 
 // Means of the windows of `reach`, with `divide` as mean_row takes it.
 template <typename RowSum, typename Sum, typename Divide>
 void average(const uint8_t* src, uint8_t* dst, int width, int height, Reach reach, Sum* scratch,
              Divide divide) {
+#if HAZE_X86
+  const auto kernel = haze::x86_kernel(haze::filter::mean_row_avx2, haze::filter::mean_row_avx512);
+  if (kernel != nullptr && PrefixRow::fits(width, reach)) {
+    average_by_prefixes(src, dst, width, height, reach, scratch, kernel);
+    return;
+  }
+#endif
   haze::filter::sweep_columns(src, width, height, reach, scratch, [=](int y, int rows) {
     haze::filter::mean_row<RowSum>(scratch, dst + static_cast<ptrdiff_t>(y) * width, width, reach,
                                    rows, divide);

@@ -7,14 +7,6 @@ int slide_rows_avx2(int16_t* sums, const uint8_t* entering, const uint8_t* leavi
   return slide_rows_x86<Avx2>(sums, entering, leaving, width);
 }
 
-int mean_windows_16_avx2(const int16_t* entering, const int16_t* leaving, uint8_t* dst, int pixels,
-                         int32_t& sum, int count) {
-  return mean_windows_x86<Avx2>(entering, leaving, dst, pixels, sum, count);
-}
-
-int mean_windows_32_avx2(const int32_t* entering, const int32_t* leaving, uint8_t* dst, int pixels,
-                         int32_t& sum, int count) {
-  return mean_windows_x86<Avx2>(entering, leaving, dst, pixels, sum, count);
-}
+void mean_row_avx2(PrefixRow& row, int rows) { mean_row_x86<Avx2>(row, rows); }
 
 }  // namespace haze::filter

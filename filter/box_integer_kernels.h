@@ -7,6 +7,7 @@
 
 #include "core/cpu_level.h"
 #include "core/numeric.h"
+#include "filter/box_prefix.h"
 
 namespace haze::filter {
 
@@ -41,18 +42,9 @@ inline void slide_rows_portable(Sum* sums, const uint8_t* entering, const uint8_
 int slide_rows_avx2(int16_t* sums, const uint8_t* entering, const uint8_t* leaving, int width);
 int slide_rows_avx512(int16_t* sums, const uint8_t* entering, const uint8_t* leaving, int width);
 
-// Means of windows that move on by one column per pixel: `sum` is the window's before the first of
-// them; entering[x] and leaving[x] are the column sums that pixel x adds and drops. Returns the
-// first pixel that it did not write, and leaves the sum of the pixel before it. For sums below 2^24
-// and counts up to 2^16.
-int mean_windows_16_avx2(const int16_t* entering, const int16_t* leaving, uint8_t* dst, int pixels,
-                         int32_t& sum, int count);
-int mean_windows_16_avx512(const int16_t* entering, const int16_t* leaving, uint8_t* dst,
-                           int pixels, int32_t& sum, int count);
-int mean_windows_32_avx2(const int32_t* entering, const int32_t* leaving, uint8_t* dst, int pixels,
-                         int32_t& sum, int count);
-int mean_windows_32_avx512(const int32_t* entering, const int32_t* leaving, uint8_t* dst,
-                           int pixels, int32_t& sum, int count);
+// Means of one output row whose windows hold `rows` rows, into row.means.
+void mean_row_avx2(PrefixRow& row, int rows);
+void mean_row_avx512(PrefixRow& row, int rows);
 #endif
 
 inline void slide_rows(int32_t* sums, const uint8_t* entering, const uint8_t* leaving, int width) {
@@ -67,42 +59,6 @@ inline void slide_rows(int16_t* sums, const uint8_t* entering, const uint8_t* le
 #endif
   slide_rows_portable(sums, entering, leaving, x, width);
 }
-
-// How far a window reaches from its centre: rows y - before ... y + after, columns likewise.
-struct Reach {
-  int before;
-  int after;
-};
-
-// Pixels of a window centred on `position` that lie in 0 ... size - 1.
-constexpr int window_count(int position, Reach reach, int size) {
-  return min(position + reach.after, size - 1) - max(position - reach.before, 0) + 1;
-}
-
-// The vector part of a row's full windows: returns how many pixels it wrote, none where there is no
-// vector path. `sum` moves on with them.
-inline int mean_windows(const int16_t* entering, const int16_t* leaving, uint8_t* dst, int pixels,
-                        int32_t& sum, int count) {
-#if HAZE_X86
-  if (const auto kernel = x86_kernel(mean_windows_16_avx2, mean_windows_16_avx512))
-    return kernel(entering, leaving, dst, pixels, sum, count);
-#endif
-  (void)entering, (void)leaving, (void)dst, (void)pixels, (void)sum, (void)count;
-  return 0;
-}
-
-inline int mean_windows(const int32_t* entering, const int32_t* leaving, uint8_t* dst, int pixels,
-                        int32_t& sum, int count) {
-#if HAZE_X86
-  if (const auto kernel = x86_kernel(mean_windows_32_avx2, mean_windows_32_avx512))
-    return kernel(entering, leaving, dst, pixels, sum, count);
-#endif
-  (void)entering, (void)leaving, (void)dst, (void)pixels, (void)sum, (void)count;
-  return 0;
-}
-
-// Sums that may pass 2^24.
-inline int mean_windows(const int32_t*, const int32_t*, uint8_t*, int, double&, int) { return 0; }
 
 // Means of one output row: dst[x] = divide(sum of the column sums in the window of x, rows,
 // columns). The window grows at the left border, keeps its width in the middle and shrinks at the
@@ -120,9 +76,7 @@ inline void mean_row(const Sum* sums, uint8_t* dst, int width, Reach reach, int 
     sum += entering[x];
     dst[x] = divide(sum, rows, reach.after + 1 + x);
   }
-  const int right = width - reach.after;
-  x += mean_windows(entering + x, leaving + x, dst + x, right - x, sum, rows * window);
-  for (; x < right; ++x) {
+  for (; x < width - reach.after; ++x) {
     sum += entering[x];
     sum -= leaving[x];
     dst[x] = divide(sum, rows, window);

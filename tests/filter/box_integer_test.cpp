@@ -185,6 +185,14 @@ TEST(Box64, WiderThanAnyFrame) {
                  Yardstick::kPrefixSums);
 }
 
+// Rows of up to 4096 columns are summed in another way where there are vectors.
+TEST(Box64, WidestRowOfPrefixSums) {
+  Random random(test_seed());
+  for (const int width : {4095, 4096, 4097})
+    compare_mean64(make_image(random, Mood::kNearMaximum, width, 65), width, 65,
+                   Yardstick::kPrefixSums);
+}
+
 TEST(Box64, BelowTheMinimumWritesNothing) {
   std::vector<uint8_t> src(area(200, 200), 99);
   const int sizes[][2] = {{63, 64},  {64, 63},   {63, 63},   {0, 64},       {64, 0},
@@ -251,6 +259,18 @@ TEST(BoxRadius, Radius1To20OnTheSmallestSizes) {
         compare_radius(make_image(random, mood, width, height), width, height, radius,
                        Yardstick::kWindows);
       }
+}
+
+// Up to 63 a column of the window sums to less than 2^15.
+TEST(BoxRadius, LargestRadiusOfPrefixSums) {
+  Random random(test_seed());
+  for (const int radius : {31, 32, 62, 63, 64})
+    for (const int extra : {0, 1, 30, 33}) {
+      const int width = 2 * radius + 1 + extra;
+      const int height = 2 * radius + 2;
+      compare_radius(make_image(random, Mood::kNearMaximum, width, height), width, height, radius,
+                     Yardstick::kPrefixSums);
+    }
 }
 
 TEST(BoxRadius, RandomSizes) {
