@@ -28,12 +28,15 @@ inline int16x4_t channel_weights_neon() {
   return loaded;
 }
 
-// channel_offsets of eight chroma pairs, bytes with their offset of 128.
-inline ChannelOffsetsNeon channel_offsets_neon(uint8x8_t cr, uint8x8_t cb, int16x4_t weights) {
-  // Twice the chroma less 128: 2c - 256 = 2 (c - 128) lies in -256 ... 254.
-  const int16x8_t twice_zero = vdupq_n_s16(2 * kChromaZero);
-  const int16x8_t cr2 = vsubq_s16(vreinterpretq_s16_u16(vshll_n_u8(cr, 1)), twice_zero);
-  const int16x8_t cb2 = vsubq_s16(vreinterpretq_s16_u16(vshll_n_u8(cb, 1)), twice_zero);
+// Chroma bytes less 128: inverting the highest bit of a byte takes 128 from its signed reading.
+inline int8x16_t centred_neon(uint8x16_t chroma) {
+  return vreinterpretq_s8_u8(veorq_u8(chroma, vdupq_n_u8(kChromaZero)));
+}
+
+// channel_offsets of eight chroma pairs, less 128.
+inline ChannelOffsetsNeon channel_offsets_neon(int8x8_t cr, int8x8_t cb, int16x4_t weights) {
+  const int16x8_t cr2 = vshll_n_s8(cr, 1);
+  const int16x8_t cb2 = vshll_n_s8(cb, 1);
   // Two products must be summed before rounding: half a weight times 2c is the same product, and
   // vrshrn adds 2^13 before it shifts.
   const int32x4_t green_low =

@@ -29,13 +29,15 @@ inline void half_bgr_row_portable(const uint8_t* luma, const uint8_t* v, const u
 #if HAZE_NEON
 // Same bytes from interleaved chroma (V first), eight pixels a step; returns the first pixel that
 // it did not write.
-inline int half_bgr_row_neon(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int end) {
+inline int half_bgr_row_neon(const uint8_t* luma, const uint8_t* vu_row, uint8_t* bgr, int end) {
   const int16x4_t weights = channel_weights_neon();
   int x = 0;
   for (; x + 8 <= end; x += 8) {
     const uint8x8_t y = vld2_u8(luma + 2 * x).val[0];
-    const uint8x8x2_t chroma = vld2_u8(vu + 2 * x);
-    const ChannelOffsetsNeon offset = channel_offsets_neon(chroma.val[0], chroma.val[1], weights);
+    const uint8x8x2_t chroma = vld2_u8(vu_row + 2 * x);
+    const int8x16_t vu = centred_neon(vcombine_u8(chroma.val[0], chroma.val[1]));
+    const ChannelOffsetsNeon offset =
+        channel_offsets_neon(vget_low_s8(vu), vget_high_s8(vu), weights);
     // Named, since vst3_u8 may be a macro that takes the commas of an initialiser for its own.
     const uint8x8x3_t pixels = {{add_clamped_neon(y, offset.blue),
                                  add_clamped_neon(y, offset.green),
