@@ -57,60 +57,90 @@ inline void group_codes_portable(const uint8_t* mean, const uint8_t* minimum, ui
 }
 
 #if HAZE_NEON
+// Whether t is a number that cannot exceed 1 whatever the pixel. Then codes may be clamped as bytes.
+constexpr bool keeps_below_one(GroupArguments arguments) {
+  return arguments.strength >= 0.0f && arguments.strength <= FLT_MAX &&
+         arguments.minus_inv_a <= 0.0f && arguments.minus_inv_a >= -FLT_MAX;
+}
+
+inline constexpr uint8_t kCodeZero = static_cast<uint8_t>(kCodeOffset);
+
 struct GroupVectors {
   float32x4_t strength;
   float32x4_t minus_inv_a;
 };
 
-// Eight pixels as two vectors of floats.
-inline float32x4x2_t widen_to_float(uint8x8_t bytes) {
-  const uint16x8_t wide = vmovl_u8(bytes);
-  return {{vcvtq_f32_u32(vmovl_u16(vget_low_u16(wide))),
-           vcvtq_f32_u32(vmovl_u16(vget_high_u16(wide)))}};
+// Every fourth of sixteen bytes, as floats: byte k of each 32-bit word. Masked where it stands and
+// converted as a number with 8 k bits of fraction, which is exact and spares the widening.
+template <int kByte>
+inline float32x4_t byte_to_float_neon(uint8x16_t bytes) {
+  const uint32x4_t words = vreinterpretq_u32_u8(bytes);
+  const uint32x4_t masked = vandq_u32(words, vdupq_n_u32(0xFFu << (8 * kByte)));
+  if constexpr (kByte == 0)
+    return vcvtq_f32_u32(masked);
+  else
+    return vcvtq_n_f32_u32(masked, 8 * kByte);
 }
 
-// vmin and vmax hand on a value that is not a number, vcvt truncates and turns it into 0.
-inline uint16x8_t four_codes_neon(float32x4_t mean, float32x4_t bound, GroupVectors arguments) {
-  const float32x4_t least = vminq_f32(vmulq_f32(mean, arguments.strength), bound);
+// trunc(200 t) of byte k of each word. With kClampsFloats t is clamped: vmin and vmax hand on a value
+// that is not a number, and the conversion turns it into 0. Otherwise t is at most 1, and negative
+// products become 0.
+template <int kByte, bool kClampsFloats>
+inline uint32x4_t scaled_transmission_neon(uint8x16_t means, uint8x16_t minima,
+                                           GroupVectors arguments) {
+  const float32x4_t scaled = vmulq_f32(byte_to_float_neon<kByte>(means), arguments.strength);
+  const float32x4_t least = vminq_f32(scaled, byte_to_float_neon<kByte>(minima));
   float32x4_t t = vaddq_f32(vdupq_n_f32(1.0f), vmulq_f32(least, arguments.minus_inv_a));
-  t = vmaxq_f32(t, vdupq_n_f32(kLeastTransmission));
-  t = vminq_f32(t, vdupq_n_f32(kMostTransmission));
-  const float32x4_t value =
-      vaddq_f32(vdupq_n_f32(-kCodeOffset), vmulq_f32(t, vdupq_n_f32(kCodeScale)));
-  return vreinterpretq_u16_u32(vcvtq_u32_f32(value));
+  if constexpr (kClampsFloats) {
+    t = vmaxq_f32(t, vdupq_n_f32(kLeastTransmission));
+    t = vminq_f32(t, vdupq_n_f32(kMostTransmission));
+  }
+  return vcvtq_u32_f32(vmulq_f32(t, vdupq_n_f32(kCodeScale)));
 }
 
-// Eight codes in the even bytes. Codes fit a byte, so narrowing keeps every second half.
-template <HighLanes kHighLanes>
-inline uint8x16_t eight_codes_neon(uint8x8_t mean_bytes, uint8x8_t minimum_bytes,
-                                   GroupVectors arguments) {
-  const float32x4x2_t mean = widen_to_float(mean_bytes);
-  const float32x4x2_t bound = widen_to_float(minimum_bytes);
-  return vreinterpretq_u8_u16(
-      vuzpq_u16(
-          four_codes_neon(mean.val[0], bound.val[0], arguments),
-          four_codes_neon(mean.val[1], bound.val[kHighLanes == HighLanes::kOwn ? 1 : 0], arguments))
-          .val[0]);
+// Same bytes, sixteen pixels a step; returns the first pixel that it did not write.
+//
+// 40 is taken off the truncated products: between 80 and 198 the difference of the floats is exact,
+// so it truncates to the same. Codes never fall as t grows, so clamping them instead of t changes
+// nothing.
+template <HighLanes kHighLanes, bool kClampsFloats>
+inline size_t clamped_group_codes_neon(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes,
+                                       size_t end, GroupArguments arguments) {
+  const GroupVectors vectors = {vdupq_n_f32(arguments.strength),
+                                vdupq_n_f32(arguments.minus_inv_a)};
+  const size_t whole = end / (2 * kGroup) * (2 * kGroup);
+  for (const uint8_t* const stop = codes + whole; codes != stop; codes += 2 * kGroup) {
+    const uint8x16_t means = vld1q_u8(mean);
+    uint8x16_t minima = vld1q_u8(minimum);
+    mean += 2 * kGroup;
+    minimum += 2 * kGroup;
+    if constexpr (kHighLanes == HighLanes::kLow) {
+      const uint32x4_t words = vreinterpretq_u32_u8(minima);
+      minima = vreinterpretq_u8_u32(vtrnq_u32(words, words).val[0]);
+    }
+    const uint32x4_t t0 = scaled_transmission_neon<0, kClampsFloats>(means, minima, vectors);
+    const uint32x4_t t1 = scaled_transmission_neon<1, kClampsFloats>(means, minima, vectors);
+    const uint32x4_t t2 = scaled_transmission_neon<2, kClampsFloats>(means, minima, vectors);
+    const uint32x4_t t3 = scaled_transmission_neon<3, kClampsFloats>(means, minima, vectors);
+    // Each insertion writes over the bits above its byte.
+    const uint32x4_t low = vsliq_n_u32(t0, t1, 8);
+    uint8x16_t scaled = vreinterpretq_u8_u32(vsliq_n_u32(vsliq_n_u32(low, t2, 16), t3, 24));
+    if constexpr (!kClampsFloats) {
+      scaled = vmaxq_u8(scaled, vdupq_n_u8(kLeastCode + kCodeZero));
+      scaled = vminq_u8(scaled, vdupq_n_u8(kMostCode + kCodeZero));
+    }
+    // Saturating, for what is not a number.
+    vst1q_u8(codes, vqsubq_u8(scaled, vdupq_n_u8(kCodeZero)));
+  }
+  return whole;
 }
 
-// Same bytes, sixteen pixels a step; returns the first pixel that it did not write. Whole registers
-// are loaded because Clang takes eight-byte loads that are widened through the stack.
 template <HighLanes kHighLanes>
 inline size_t group_codes_neon(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes,
                                size_t end, GroupArguments arguments) {
-  const GroupVectors vectors = {vdupq_n_f32(arguments.strength),
-                                vdupq_n_f32(arguments.minus_inv_a)};
-  size_t i = 0;
-  for (; i + 2 * kGroup <= end; i += 2 * kGroup) {
-    const uint8x16_t means = vld1q_u8(mean + i);
-    const uint8x16_t minima = vld1q_u8(minimum + i);
-    vst1q_u8(
-        codes + i,
-        vuzpq_u8(eight_codes_neon<kHighLanes>(vget_low_u8(means), vget_low_u8(minima), vectors),
-                 eight_codes_neon<kHighLanes>(vget_high_u8(means), vget_high_u8(minima), vectors))
-            .val[0]);
-  }
-  return i;
+  return keeps_below_one(arguments)
+             ? clamped_group_codes_neon<kHighLanes, false>(mean, minimum, codes, end, arguments)
+             : clamped_group_codes_neon<kHighLanes, true>(mean, minimum, codes, end, arguments);
 }
 #endif
 
