@@ -2,6 +2,7 @@
 #include <unistd.h>
 
 #include <csignal>
+#include <cstdio>
 #include <exception>
 #include <new>
 #include <optional>
@@ -11,38 +12,47 @@
 #include "dehaze_picture.h"
 #include "dehaze_video.h"
 #include "errors.h"
+#include "find_light.h"
 #include "interrupt.h"
 #include "media/av_error.h"
 #include "media/reader.h"
 #include "options.h"
 #include "output_file.h"
+#include "show.h"
 
 namespace dehaze {
 namespace {
 
+bool is_light_only(const Options& options) { return options.output.empty(); }
+
 void run(const Options& options) {
-  if (options.output != "-") {
+  if (is_light_only(options)) {
+    // Nothing is written.
+  } else if (options.output != "-") {
     check_output_path(options.input, options.output, options.force);
   } else if (isatty(STDOUT_FILENO)) {
     throw UsageError("standard output is a terminal; send the Y4M stream to a file or a program");
   }
   Console console(options.quiet);
   Reader reader(options.input);
-  FrameTimes times;
-  if (is_picture_kind(options.output_kind)) {
+  RunReport report;
+  if (is_light_only(options)) {
+    report = find_light(reader, options, console);
+  } else if (is_picture_kind(options.output_kind)) {
     if (!reader.is_picture()) {
       console.note("the input is a video; its first frame becomes the picture");
     }
-    times = dehaze_picture(reader, options, console);
+    report = dehaze_picture(reader, options, console);
   } else if (reader.is_picture()) {
     throw Error(reader.path() +
                 ": a picture cannot become a video; name the output .jpg, .png or .webp");
   } else {
-    times = dehaze_video(reader, options, console);
+    report = dehaze_video(reader, options, console);
   }
   console.clear_progress();
+  if (options.engine.show == Show::kLight) std::puts(describe(report.findings).c_str());
   // Asked for by name, so not subject to --quiet.
-  if (options.timing) print_error("time per frame: " + describe(times));
+  if (options.timing) print_error("time per frame: " + describe(report.times));
 }
 
 int guarded_main(int argc, char** argv) {

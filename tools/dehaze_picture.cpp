@@ -31,12 +31,12 @@ void copy_icc_profile(const AVFrame& from, AVFrame* to, OutputKind kind, Console
 
 }  // namespace
 
-FrameTimes dehaze_picture(Reader& reader, const Options& options, Console& console) {
+RunReport dehaze_picture(Reader& reader, const Options& options, Console& console) {
   const FramePtr frame = make_frame();
   if (!reader.read_frame(frame.get())) throw Error(reader.path() + ": holds no picture");
 
   const Orientation orientation = orientation_of(reader, *frame);
-  FramePath path(*frame, reader.is_picture(), options.level, console);
+  FramePath path(*frame, reader.is_picture(), 0, options.engine, console);
   const FrameSize& size = path.size();
   const Nv21Frame& nv21 = path.run(*frame);
 
@@ -62,7 +62,7 @@ FrameTimes dehaze_picture(Reader& reader, const Options& options, Console& conso
   write_picture(*picture, options.output_kind, file.temporary_path());
   throw_if_interrupted();
   file.commit();
-  return path.times();
+  return path.engine().report();
 }
 
 }  // namespace dehaze

@@ -3,7 +3,7 @@
 #define TOOLS_DEHAZE_PICTURE_H
 
 #include "console.h"
-#include "haze_session.h"
+#include "engine.h"
 #include "media/reader.h"
 #include "options.h"
 
@@ -11,7 +11,7 @@ namespace dehaze {
 
 // Of a video the first frame is taken. The picture comes out upright and without an orientation
 // tag. A single frame is always an estimate frame.
-FrameTimes dehaze_picture(Reader& reader, const Options& options, Console& console);
+RunReport dehaze_picture(Reader& reader, const Options& options, Console& console);
 
 }  // namespace dehaze
 

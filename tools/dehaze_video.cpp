@@ -64,12 +64,12 @@ VideoFormat turned(VideoFormat format, const Orientation& turn) {
 
 }  // namespace
 
-FrameTimes dehaze_video(Reader& reader, const Options& options, Console& console) {
+RunReport dehaze_video(Reader& reader, const Options& options, Console& console) {
   const OutputKind kind = options.output_kind;
   const FramePtr input = make_frame();
   if (!reader.read_frame(input.get())) throw Error(reader.path() + ": holds no video");
 
-  FramePath path(*input, false, options.level, console);
+  FramePath path(*input, false, frames_per_second(reader), options.engine, console);
   note_what_is_lost(reader, path.size(), kind, console);
   const Orientation turn = turn_for(reader, kind);
   const VideoFormat format = format_before_turn(reader, *input, path, kind);
@@ -108,7 +108,7 @@ FrameTimes dehaze_video(Reader& reader, const Options& options, Console& console
   writer.finish(reader.pending_audio(), audio_end);
   throw_if_interrupted();
   if (file) file->commit();
-  return path.times();
+  return path.engine().report();
 }
 
 }  // namespace dehaze

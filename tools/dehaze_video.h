@@ -3,13 +3,13 @@
 #define TOOLS_DEHAZE_VIDEO_H
 
 #include "console.h"
-#include "haze_session.h"
+#include "engine.h"
 #include "media/reader.h"
 #include "options.h"
 
 namespace dehaze {
 
-FrameTimes dehaze_video(Reader& reader, const Options& options, Console& console);
+RunReport dehaze_video(Reader& reader, const Options& options, Console& console);
 
 }  // namespace dehaze
 

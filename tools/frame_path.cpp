@@ -1,8 +1,10 @@
 #include "frame_path.h"
 
+#include <optional>
 #include <string>
 
 #include "media/color_tags.h"
+#include "show.h"
 
 namespace dehaze {
 namespace {
@@ -11,8 +13,9 @@ void note_losses(const AVFrame& frame, const FrameSize& size, Console& console) 
   if (size.is_scaled()) {
     console.note("scaled down from " + std::to_string(size.source_width) + " x " +
                  std::to_string(size.source_height) + " to " + std::to_string(size.visible_width) +
-                 " x " + std::to_string(size.visible_height) + " (frames have at most " +
-                 std::to_string(kMaxFrameWidth) + " x " + std::to_string(kMaxFrameHeight) + ")");
+                 " x " + std::to_string(size.visible_height) +
+                 " (the preview engine takes at most " + std::to_string(kMaxFrameWidth) + " x " +
+                 std::to_string(kMaxFrameHeight) + "; --engine photo keeps the size)");
   }
   const int bits = bits_per_sample(static_cast<AVPixelFormat>(frame.format));
   if (bits > 8) console.note(std::to_string(bits) + "-bit input is converted to 8 bits");
@@ -23,12 +26,25 @@ void note_losses(const AVFrame& frame, const FrameSize& size, Console& console) 
 
 }  // namespace
 
-FramePath::FramePath(const AVFrame& first, bool is_picture, int level, Console& console)
-    : size_(fit_frame_size(first.width, first.height)),
+double frames_per_second(const Reader& reader) {
+  const AVRational rate = reader.frame_rate();
+  return rate.num > 0 && rate.den > 0 ? av_q2d(rate) : 0;
+}
+
+FramePath::FramePath(const AVFrame& first, bool is_picture, double frames_per_second,
+                     const EngineOptions& options, Console& console)
+    : FramePath(choose_engine(options, first.width, first.height, is_picture), first, is_picture,
+                frames_per_second, options, console) {}
+
+FramePath::FramePath(EngineKind kind, const AVFrame& first, bool is_picture,
+                     double frames_per_second, const EngineOptions& options, Console& console)
+    : size_(engine_frame_size(kind, first.width, first.height)),
       siting_(meaning_of(first, is_picture).siting),
+      show_(options.show),
       console_(console),
       to_nv21_(size_, is_picture, siting_),
-      session_(size_.padded_width(), size_.padded_height(), level),
+      engine_(make_engine(kind, options, size_.padded_width(), size_.padded_height(),
+                          frames_per_second, console)),
       nv21_(size_.padded_width(), size_.padded_height()) {
   note_losses(first, size_, console);
 }
@@ -40,7 +56,11 @@ const Nv21Frame& FramePath::run(const AVFrame& frame) {
                   std::to_string(size_.visible_width) + " x " +
                   std::to_string(size_.visible_height));
   }
-  session_.process(nv21_);
+  std::optional<Nv21Frame> before;
+  if (show_ == Show::kCompare) before = nv21_;
+  engine_->process(nv21_);
+  if (show_ == Show::kMap) draw_map(engine_->transmission(), nv21_);
+  if (before) draw_compare(*before, nv21_);
   return nv21_;
 }
 

@@ -1,35 +1,46 @@
-// The way of every frame through the library: to NV21, haze removal, NV21.
+// The way of every frame through an engine: to NV21, haze removal, NV21.
 #ifndef TOOLS_FRAME_PATH_H
 #define TOOLS_FRAME_PATH_H
 
+#include <memory>
+
 #include "console.h"
-#include "haze_session.h"
+#include "engine.h"
 #include "media/color_convert.h"
 #include "media/ffmpeg_handles.h"
 #include "media/frame_size.h"
 #include "media/nv21.h"
+#include "media/reader.h"
 
 namespace dehaze {
 
+// Of a video; 0 if unknown.
+double frames_per_second(const Reader& reader);
+
 class FramePath {
  public:
-  // The first frame decides on the size that all frames are brought to. Notes what is lost on the
-  // way (size, bits, fields).
-  FramePath(const AVFrame& first, bool is_picture, int level, Console& console);
+  // The first frame decides on the engine and on the size that all frames are brought to. Notes
+  // what is lost on the way (size, bits, fields). frames_per_second: 0 if unknown or a picture.
+  FramePath(const AVFrame& first, bool is_picture, double frames_per_second,
+            const EngineOptions& options, Console& console);
 
   const FrameSize& size() const { return size_; }
   AVChromaLocation siting() const { return siting_; }
-  const FrameTimes& times() const { return session_.times(); }
+  const Engine& engine() const { return *engine_; }
 
-  // The result is valid until the next call.
+  // The result, or what is to be shown instead of it; valid until the next call.
   const Nv21Frame& run(const AVFrame& frame);
 
  private:
+  FramePath(EngineKind kind, const AVFrame& first, bool is_picture, double frames_per_second,
+            const EngineOptions& options, Console& console);
+
   FrameSize size_;
   AVChromaLocation siting_;
+  Show show_;
   Console& console_;
   ToNv21 to_nv21_;
-  HazeSession session_;
+  std::unique_ptr<Engine> engine_;
   Nv21Frame nv21_;
   bool change_noted_ = false;
 };

@@ -16,7 +16,8 @@ namespace {
 constexpr char kExamples[] =
     "Examples:\n"
     "  dehaze hazy.jpg clear.jpg\n"
-    "  dehaze --level 12 --max-frames 250 drive.mp4 preview.mp4\n"
+    "  dehaze --strength 40 --max-frames 250 drive.mp4 trial.mp4\n"
+    "  dehaze --show compare hazy.jpg before_after.png\n"
     "  ffmpeg -i drive.mp4 -f yuv4mpegpipe - | dehaze - - | ffplay -\n"
     "\n"
     "Exit status: 0 done, 1 failed, 2 wrong usage, 128 + n stopped by signal n.";
@@ -47,17 +48,13 @@ std::optional<Options> parse_options(int argc, char** argv) {
   app.add_option("INPUT", options.input, "picture or video, or - for Y4M on standard input")
       ->type_name("")
       ->required();
-  app.add_option("OUTPUT", options.output,
-                 "picture (.jpg .png .webp), video (.mp4 .mkv .mov .y4m), or - for Y4M on standard "
-                 "output")
-      ->type_name("")
-      ->required();
-  // The ranges are in the help texts; without a description CLI11 does not print them again.
-  app.add_option("--level", options.level,
-                 "amount of haze removal, 0 to " + std::to_string(kMaxLevel))
-      ->type_name("N")
-      ->check(CLI::Range(0, kMaxLevel).description(""))
-      ->capture_default_str();
+  const CLI::Option* output =
+      app.add_option(
+             "OUTPUT", options.output,
+             "picture (.jpg .png .webp), video (.mp4 .mkv .mov .y4m), or - for Y4M on standard "
+             "output")
+          ->type_name("");
+  add_engine_options(app, options.engine);
   app.add_option("--max-frames", options.max_frames, "stop a video after N frames")
       ->type_name("N")
       ->check(CLI::Range(int64_t{1}, std::numeric_limits<int64_t>::max()).description(""));
@@ -76,8 +73,16 @@ std::optional<Options> parse_options(int argc, char** argv) {
     throw UsageError(std::string(error.what()) + "\nRun with --help for more information.");
   }
   if (options.input.empty()) throw UsageError("the name of the input is empty");
-  if (options.output.empty()) throw UsageError("the name of the output is empty");
-  options.output_kind = output_kind_of(options.output);
+  check_engine_options(options.engine);
+  if (output->count() > 0) {
+    if (options.output.empty()) throw UsageError("the name of the output is empty");
+    options.output_kind = output_kind_of(options.output);
+  } else if (options.engine.show != Show::kLight) {
+    throw UsageError("OUTPUT is required\nRun with --help for more information.");
+  }
+  if (options.engine.show == Show::kLight && options.output == "-") {
+    throw UsageError("--show light prints to standard output, so that cannot be OUTPUT as well");
+  }
   return options;
 }
 

@@ -6,13 +6,9 @@
 #include <optional>
 #include <string>
 
-namespace dehaze {
+#include "engine_options.h"
 
-// Amount of haze removal when the command line does not say. Measured on the rendered pair in
-// samples/, whose clear version is known: from 8 to 11 both PSNR and SSIM against it are near their
-// best, below the haze stays, above the ground turns black. README.md has the table.
-constexpr int kDefaultLevel = 10;
-constexpr int kMaxLevel = 255;
+namespace dehaze {
 
 enum class OutputKind { kJpeg, kPng, kWebp, kMp4, kMov, kMkv, kY4m };
 
@@ -22,9 +18,9 @@ inline bool is_picture_kind(OutputKind kind) {
 
 struct Options {
   std::string input;   // "-": Y4M on standard input
-  std::string output;  // "-": Y4M on standard output
+  std::string output;  // "-": Y4M on standard output; empty: only the light is printed
   OutputKind output_kind = OutputKind::kY4m;
-  int level = kDefaultLevel;
+  EngineOptions engine;
   int64_t max_frames = 0;  // 0: all
   bool quiet = false;
   bool force = false;

@@ -19,6 +19,14 @@ case_wrong_usage() {
   dehaze_fails 2 'not in range' --level high in.png out.png
   dehaze_fails 2 'not in range' --level 256 in.png out.png
   dehaze_fails 2 'not in range' --level -1 in.png out.png
+  dehaze_fails 2 'strength: "high" is neither auto nor in range' --strength high in.png out.png
+  dehaze_fails 2 'strength: "101" is neither auto nor in range' --strength 101 in.png out.png
+  dehaze_fails 2 'excludes' --strength 50 --level 10 in.png out.png
+  dehaze_fails 2 'excludes' --level 10 --strength auto in.png out.png
+  dehaze_fails 2 'level is a number of the preview engine' --level 10 --engine photo in.png out.png
+  dehaze_fails 2 'engine: "fast" is not one of photo, preview' --engine fast in.png out.png
+  dehaze_fails 2 'show: "haze" is not one of compare, light, map' --show haze in.png out.png
+  dehaze_fails 2 'show light prints to standard output' --show light in.png -
   dehaze_fails 2 'not in range' --max-frames 0 in.png out.png
   dehaze_fails 2 'name of the input is empty' '' out.png
   dehaze_fails 2 'name of the output is empty' in.png ''
@@ -51,9 +59,9 @@ case_picture_to_video() {
 
 case_quiet() {
   make_video in.mp4 1600x900 0.2
-  dehaze in.mp4 loud.mp4
+  dehaze --engine preview in.mp4 loud.mp4
   says 'scaled down from 1600 x 900 to 1280 x 720'
-  dehaze --quiet in.mp4 quiet.mp4
+  dehaze --engine preview --quiet in.mp4 quiet.mp4
   says_nothing
   # Errors are not silenced.
   dehaze_fails 1 'exists already' --quiet in.mp4 quiet.mp4

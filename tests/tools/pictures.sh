@@ -50,15 +50,6 @@ luma_deviation() {
     sed -nE 's/.*stdev:\[([0-9.]+).*/\1/p' | awk '{printf "%d\n", $1 * 100}'
 }
 
-case_default_level() {
-  make_picture in.png 320x240
-  dehaze in.png default.png
-  local level
-  level=$("$DEHAZE" --help | sed -nE 's/.*--level N=([0-9]+).*/\1/p')
-  dehaze --level "$level" in.png given.png
-  same_picture default.png given.png
-}
-
 case_same_every_time() {
   make_picture in.png 320x240
   dehaze in.png a.png
@@ -138,25 +129,29 @@ case_too_small() {
   local size
   for size in 127x200 200x127 1x1; do
     make_picture in.png $size
-    dehaze_fails 1 "the picture is ${size/x/ x }.*at least 128 x 128" in.png out.png
+    dehaze_fails 1 "the picture is ${size/x/ x }.*at least 128 x 128" --engine preview in.png out.png
+  done
+  for size in 7x100 100x7 1x1; do
+    make_picture in.png $size
+    dehaze_fails 1 "the picture is ${size/x/ x }.*at least 8 x 8" in.png out.png
   done
   only_files in.png
 }
 
 case_too_large() {
   make_picture in.png 1921x1080
-  dehaze in.png out.png
+  dehaze --engine preview in.png out.png
   says 'scaled down from 1921 x 1080 to 1280 x 720'
   equal "$(stream out.png v width,height)" 1280,720
   # Portrait: at most 720 rows.
   make_picture in.png 1080x1920
-  dehaze --force in.png out.png
+  dehaze --engine preview --force in.png out.png
   equal "$(stream out.png v width,height)" 406,720
   make_picture in.png 1280x721
-  dehaze --force in.png out.png
+  dehaze --engine preview --force in.png out.png
   equal "$(stream out.png v width,height)" 1278,720
   make_picture in.png 1280x720
-  dehaze --force in.png out.png
+  dehaze --engine preview --force in.png out.png
   says_nothing
   equal "$(stream out.png v width,height)" 1280,720
 }
@@ -172,7 +167,7 @@ case_scaled_content() {
 
 case_too_narrow() {
   make_picture in.png 4000x300
-  dehaze_fails 1 'too long and narrow' in.png out.png
+  dehaze_fails 1 'too long and narrow' --engine preview in.png out.png
   only_files in.png
 }
 

@@ -199,17 +199,17 @@ case_odd_size() {
 
 case_scaled_down() {
   make_video in.mp4 1920x1080 0.2
-  dehaze in.mp4 out.mp4
+  dehaze --engine preview in.mp4 out.mp4
   says 'scaled down from 1920 x 1080 to 1280 x 720'
   equal "$(stream out.mp4 v width,height)" 1280,720
   make_video in.mp4 1080x1920 0.2
-  dehaze --force in.mp4 out.mp4
+  dehaze --engine preview --force in.mp4 out.mp4
   equal "$(stream out.mp4 v width,height)" 406,720
 }
 
 case_too_small() {
   make_video in.mp4 126x240 0.2
-  dehaze_fails 1 'at least 128 x 128' in.mp4 out.mp4
+  dehaze_fails 1 'at least 128 x 128' --engine preview in.mp4 out.mp4
   only_files in.mp4
 }
 

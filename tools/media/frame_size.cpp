@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstdint>
 #include <string>
 
 #include "errors.h"
@@ -21,7 +22,7 @@ FrameSize fit_frame_size(int width, int height) {
   const std::string smallest = text(kMinFrameSide, kMinFrameSide);
   if (width < kMinFrameSide || height < kMinFrameSide) {
     throw Error("the picture is " + text(width, height) + "; it must be at least " + smallest +
-                ", so enlarge it first");
+                ", so enlarge it first or use --engine photo");
   }
   FrameSize size = {width, height, width, height};
   if (width <= kMaxFrameWidth && height <= kMaxFrameHeight) return size;
@@ -33,9 +34,24 @@ FrameSize fit_frame_size(int width, int height) {
   if (size.visible_width < kMinFrameSide || size.visible_height < kMinFrameSide) {
     throw Error("the picture is " + text(width, height) + ", too long and narrow: scaled into " +
                 text(kMaxFrameWidth, kMaxFrameHeight) + " it falls below " + smallest +
-                ", so crop it first");
+                ", so crop it first or use --engine photo");
   }
   return size;
+}
+
+FrameSize whole_frame_size(int width, int height) {
+  if (width < kMinPhotoSide || height < kMinPhotoSide) {
+    throw Error("the picture is " + text(width, height) + "; it must be at least " +
+                text(kMinPhotoSide, kMinPhotoSide) + ", so enlarge it first");
+  }
+  const int64_t pixels = static_cast<int64_t>(width) * height;
+  if (width > kMaxPhotoSide || height > kMaxPhotoSide ||
+      pixels > kMaxPhotoMegapixels * int64_t{1000000} + 217728) {
+    throw Error("the picture is " + text(width, height) + "; it may have at most " +
+                std::to_string(kMaxPhotoMegapixels) + " megapixels and no side above " +
+                std::to_string(kMaxPhotoSide) + ", so reduce it first");
+  }
+  return {width, height, width, height};
 }
 
 }  // namespace dehaze

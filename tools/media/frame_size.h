@@ -4,10 +4,16 @@
 
 namespace dehaze {
 
-// Limits of the library's frame path.
+// Limits of the library's frame path, which is the preview engine.
 constexpr int kMaxFrameWidth = 1280;
 constexpr int kMaxFrameHeight = 720;
 constexpr int kMinFrameSide = 128;
+
+// Limits of the building blocks as the photo engine uses them. The smallest half-resolution map has
+// 4 x 4 samples, which a guided filter needs; sizes in bytes have to fit 32-bit arithmetic.
+constexpr int kMinPhotoSide = 8;
+constexpr int kMaxPhotoSide = 32768;
+constexpr int kMaxPhotoMegapixels = 134;  // 8192 x 16384
 
 struct FrameSize {
   int source_width;
@@ -26,6 +32,9 @@ struct FrameSize {
 // Larger frames are scaled down to fit, keeping their shape to the nearest even size. Throws Error
 // for frames that are too small, also those that are so only after scaling.
 FrameSize fit_frame_size(int width, int height);
+
+// Frames keep their size. Throws Error for those beyond the limits of the photo engine.
+FrameSize whole_frame_size(int width, int height);
 
 }  // namespace dehaze
 

@@ -1,11 +1,10 @@
-#include "haze_session.h"
+#include "engine.h"
 
 #include <algorithm>
-#include <chrono>
 #include <cstdio>
 
-#include "errors.h"
-#include "haze_preview.h"
+#include "photo_engine.h"
+#include "preview_engine.h"
 
 namespace dehaze {
 namespace {
@@ -34,24 +33,17 @@ std::string describe(const FrameTimes& times) {
   return text.empty() ? "no frames" : text;
 }
 
-HazeSession::HazeSession(int width, int height, int level)
-    : width_(width), height_(height), level_(level) {
-  InitHazePreviewFormat(kInputFormatNv21, width, height);
-  if (gHazePreviewMemory == nullptr) throw Error("not enough memory for the frame");
+FrameSize engine_frame_size(EngineKind kind, int width, int height) {
+  return kind == EngineKind::kPreview ? fit_frame_size(width, height)
+                                      : whole_frame_size(width, height);
 }
 
-HazeSession::~HazeSession() { ReleaseHazePreview(); }
-
-void HazeSession::process(Nv21Frame& frame) {
-  if (frame.width != width_ || frame.height != height_) {
-    throw Error("internal error: a frame does not have the size of its session");
+std::unique_ptr<Engine> make_engine(EngineKind kind, const EngineOptions& options, int width,
+                                    int height, double frames_per_second, Console& console) {
+  if (kind == EngineKind::kPreview) {
+    return std::make_unique<PreviewEngine>(width, height, options, console);
   }
-  using Clock = std::chrono::steady_clock;
-  const bool is_estimate = gPreFrameNum == 0;
-  const Clock::time_point start = Clock::now();
-  RemoveHazePreview(frame.bytes.data(), width_, height_, 0, level_);
-  const double ms = std::chrono::duration<double, std::milli>(Clock::now() - start).count();
-  (is_estimate ? times_.estimate_ms : times_.reuse_ms).push_back(ms);
+  return std::make_unique<PhotoEngine>(width, height, options.strength, frames_per_second);
 }
 
 }  // namespace dehaze
