@@ -1,8 +1,10 @@
 # Header, library, CMake package and pkg-config file.
 include(CMakePackageConfigHelpers)
+set(CMAKE_INSTALL_DEFAULT_COMPONENT_NAME development)
 
 set(package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/haze_preview)
-install(TARGETS haze_preview EXPORT haze_previewTargets)
+install(TARGETS haze_preview EXPORT haze_previewTargets
+  LIBRARY COMPONENT library NAMELINK_COMPONENT development)
 install(FILES include/haze_preview.h TYPE INCLUDE)
 install(EXPORT haze_previewTargets NAMESPACE haze_preview:: DESTINATION ${package_dir})
 
