@@ -3,9 +3,9 @@
 
 namespace haze::estimate {
 
-size_t group_codes_avx512(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
-                          float strength, float minus_inv_a) {
-  return group_codes_x86<Avx512>(mean, minimum, codes, end, strength, minus_inv_a);
+size_t look_up_codes_avx512(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
+                            const uint8_t* of_mean, const uint8_t* of_minimum) {
+  return look_up_codes_x86<Avx512>(mean, minimum, codes, end, of_mean, of_minimum);
 }
 
 }  // namespace haze::estimate

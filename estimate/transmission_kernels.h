@@ -10,6 +10,7 @@
 #include <stdint.h>
 
 #include "core/cpu_level.h"
+#include "core/numeric.h"
 #include "core/target.h"
 #include "estimate/transmission_code.h"
 
@@ -28,6 +29,13 @@ struct GroupArguments {
   float minus_inv_a;
 };
 
+// Whether the code of min(strength * mean, minimum) / A can only fall when that minimum rises, with
+// nothing on the way that is not a number.
+constexpr bool are_monotone(GroupArguments arguments) {
+  return arguments.strength >= 0.0f && arguments.strength <= FLT_MAX &&
+         arguments.minus_inv_a <= 0.0f && arguments.minus_inv_a >= -FLT_MAX;
+}
+
 constexpr float flush_subnormal(float value) {
   return value < FLT_MIN && value > -FLT_MIN ? 0.0f : value;
 }
@@ -36,24 +44,50 @@ constexpr GroupArguments group_arguments(float strength, float inv_a) {
   return {flush_subnormal(strength), 0.0f - flush_subnormal(inv_a)};
 }
 
-// Codes of pixels [begin, end), both multiples of eight:
-// t = 1 - min(strength * mean, minimum) / A, T = trunc(200 * clamp(t) - 40).
+// t = 1 - least / A, T = trunc(200 * clamp(t) - 40).
 //
 // The comparisons are written so that a value that is not a number passes all of them unchanged.
 // Range: a clamped t gives 40 ... 158 exactly (0.4f * 200 and 0.99f * 200 round to 80 and 198).
+inline uint8_t group_code(float least, float minus_inv_a) {
+  float t = 1.0f + least * minus_inv_a;
+  t = t < kLeastTransmission ? kLeastTransmission : t;
+  t = t > kMostTransmission ? kMostTransmission : t;
+  const float value = -kCodeOffset + t * kCodeScale;
+  return static_cast<uint8_t>(static_cast<int>(value == value ? value : 0.0f));
+}
+
+// Codes of pixels [begin, end), both multiples of eight, with least = min(strength * mean,
+// minimum).
 template <HighLanes kHighLanes>
 inline void group_codes_portable(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes,
                                  size_t begin, size_t end, GroupArguments arguments) {
   for (size_t i = begin; i < end; ++i) {
     const float bound = minimum[kHighLanes == HighLanes::kOwn ? i : i & ~size_t{4}];
     const float scaled = static_cast<float>(mean[i]) * arguments.strength;
-    const float least = scaled > bound ? bound : scaled;
-    float t = 1.0f + least * arguments.minus_inv_a;
-    t = t < kLeastTransmission ? kLeastTransmission : t;
-    t = t > kMostTransmission ? kMostTransmission : t;
-    const float value = -kCodeOffset + t * kCodeScale;
-    codes[i] = static_cast<uint8_t>(static_cast<int>(value == value ? value : 0.0f));
+    codes[i] = group_code(scaled > bound ? bound : scaled, arguments.minus_inv_a);
   }
+}
+
+// The codes of every mean and of every minimum, each as if it were the lesser of the two. With
+// monotone arguments a pixel's code is the larger of its two entries: the code of a minimum of two
+// values is the maximum of their codes.
+struct CodeTables {
+  uint8_t of_mean[256];
+  uint8_t of_minimum[256];
+
+  explicit CodeTables(GroupArguments arguments) {
+    for (int value = 0; value < 256; ++value) {
+      const float sample = static_cast<float>(value);
+      of_mean[value] = group_code(sample * arguments.strength, arguments.minus_inv_a);
+      of_minimum[value] = group_code(sample, arguments.minus_inv_a);
+    }
+  }
+};
+
+inline void look_up_codes_portable(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes,
+                                   size_t begin, size_t end, const CodeTables& tables) {
+  for (size_t i = begin; i < end; ++i)
+    codes[i] = max(tables.of_mean[mean[i]], tables.of_minimum[minimum[i]]);
 }
 
 #if HAZE_NEON
@@ -146,11 +180,32 @@ inline size_t group_codes_neon(const uint8_t* mean, const uint8_t* minimum, uint
 
 #if HAZE_X86
 // Same bytes with the pixels' own minima; each returns the first pixel that it did not write.
+// Arithmetic is faster than lookups in a vector of 32 bytes, but not in one of 64.
 size_t group_codes_avx2(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
                         float strength, float minus_inv_a);
-size_t group_codes_avx512(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
-                          float strength, float minus_inv_a);
+size_t look_up_codes_avx512(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
+                            const uint8_t* of_mean, const uint8_t* of_minimum);
 #endif
+
+// Codes of the first pixels with their own minima in a faster way, where there is one; returns how
+// many.
+inline size_t leading_codes(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
+                            GroupArguments arguments) {
+#if HAZE_X86
+  if (cpu_level() == CpuLevel::kAvx2)
+    return group_codes_avx2(mean, minimum, codes, end, arguments.strength, arguments.minus_inv_a);
+#endif
+  constexpr size_t kPixelsWorthTables = 4096;
+  if (end < kPixelsWorthTables || !are_monotone(arguments)) return 0;
+  const CodeTables tables(arguments);
+  size_t done = 0;
+#if HAZE_X86
+  if (cpu_level() == CpuLevel::kAvx512)
+    done = look_up_codes_avx512(mean, minimum, codes, end, tables.of_mean, tables.of_minimum);
+#endif
+  look_up_codes_portable(mean, minimum, codes, done, end, tables);
+  return end;
+}
 
 // Codes of whole groups, pixels [0, end).
 template <HighLanes kHighLanes>
@@ -159,11 +214,9 @@ inline void group_codes(const uint8_t* mean, const uint8_t* minimum, uint8_t* co
   size_t done = 0;
 #if HAZE_NEON
   done = group_codes_neon<kHighLanes>(mean, minimum, codes, end, arguments);
-#elif HAZE_X86
-  if constexpr (kHighLanes == HighLanes::kOwn) {
-    if (const auto kernel = x86_kernel(group_codes_avx2, group_codes_avx512))
-      done = kernel(mean, minimum, codes, end, arguments.strength, arguments.minus_inv_a);
-  }
+#else
+  if constexpr (kHighLanes == HighLanes::kOwn)
+    done = leading_codes(mean, minimum, codes, end, arguments);
 #endif
   group_codes_portable<kHighLanes>(mean, minimum, codes, done, end, arguments);
 }

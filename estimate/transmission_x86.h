@@ -35,4 +35,18 @@ size_t group_codes_x86(const uint8_t* mean, const uint8_t* minimum, uint8_t* cod
   return i;
 }
 
+// As look_up_codes_portable; returns the first pixel that it did not write.
+template <typename V>
+size_t look_up_codes_x86(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
+                         const uint8_t* of_mean, const uint8_t* of_minimum) {
+  const typename V::Table mean_table(of_mean);
+  const typename V::Table minimum_table(of_minimum);
+  size_t i = 0;
+  for (; i + V::kBytes <= end; i += V::kBytes) {
+    V::store(codes + i,
+             V::max8u(mean_table[V::load(mean + i)], minimum_table[V::load(minimum + i)]));
+  }
+  return i;
+}
+
 }  // namespace haze::estimate
