@@ -2,18 +2,19 @@
 #include <stddef.h>
 
 #include "color/half_bgr_kernels.h"
+#include "core/shared_int.h"
 #include "haze_preview.h"
 
 namespace {
 
-// Converts `rows` row pairs of an NV21 frame into rows of `blocks` pixels; `luma_step` bytes lie
-// between row pairs.
-void convert_nv21(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int blocks, int rows,
-                  ptrdiff_t luma_step) {
+// Converts `rows` row pairs of an NV21 frame into rows of `blocks` pixels, of which `whole` have two
+// columns; `luma_step` bytes lie between row pairs.
+void convert_nv21(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int blocks, int whole,
+                  int rows, ptrdiff_t luma_step) {
   for (int y = 0; y < rows; ++y) {
     haze::color::half_bgr_row_nv21(luma + y * luma_step,
                                    vu + static_cast<ptrdiff_t>(y) * 2 * blocks,
-                                   bgr + static_cast<ptrdiff_t>(y) * 3 * blocks, blocks);
+                                   bgr + static_cast<ptrdiff_t>(y) * 3 * blocks, blocks, whole);
   }
 }
 
@@ -25,8 +26,9 @@ int half_rounded_up(int side) { return side < 1 ? 0 : (side - 1) / 2 + 1; }
 void xYCrCb2BGRPreview(unsigned char* luma, unsigned char* uPlane, unsigned char* bgr, int width,
                        int height) {
   const int blocks = half_rounded_up(width);
-  const unsigned char* const vPlane =
-      uPlane + static_cast<ptrdiff_t>(gZoomOutHPreview) * gZoomOutWPreview / 4;
+  const ptrdiff_t frame_pixels = static_cast<ptrdiff_t>(haze::load_shared(gZoomOutHPreview)) *
+                                 haze::load_shared(gZoomOutWPreview);
+  const unsigned char* const vPlane = uPlane + frame_pixels / 4;
   for (int y = 0; y < half_rounded_up(height); ++y) {
     const ptrdiff_t chroma = static_cast<ptrdiff_t>(y) * blocks;
     haze::color::half_bgr_row_portable<1>(luma + static_cast<ptrdiff_t>(2 * y) * width,
@@ -37,7 +39,7 @@ void xYCrCb2BGRPreview(unsigned char* luma, unsigned char* uPlane, unsigned char
 
 void xYCrCb2BGRPreview_NV21(unsigned char* luma, unsigned char* vu, unsigned char* bgr, int width,
                             int height) {
-  convert_nv21(luma, vu, bgr, half_rounded_up(width), half_rounded_up(height),
+  convert_nv21(luma, vu, bgr, half_rounded_up(width), width / 2, half_rounded_up(height),
                2 * static_cast<ptrdiff_t>(width));
 }
 
@@ -46,5 +48,6 @@ void xYCrCb2BGRPreviewNeon_NV21(unsigned char* luma, unsigned char* vu, unsigned
   // Rounds odd sizes down, and steps from the pixels that it used: with an odd width both planes
   // drift by a byte per row.
   const int blocks = width / 2;
-  convert_nv21(luma, vu, bgr, blocks, height / 2, 2 * static_cast<ptrdiff_t>(blocks) + width);
+  convert_nv21(luma, vu, bgr, blocks, blocks, height / 2,
+               2 * static_cast<ptrdiff_t>(blocks) + width);
 }

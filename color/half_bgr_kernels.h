@@ -53,16 +53,20 @@ int half_bgr_row_avx2(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int 
 int half_bgr_row_avx512(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int end);
 #endif
 
-// `vu` is a row of NV21 chroma.
-inline void half_bgr_row_nv21(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int width) {
+// `vu` is a row of NV21 chroma. Of the `blocks` blocks the first `whole` have two columns of luma,
+// as the vector paths read them: the byte behind a last single column may be past the image.
+inline void half_bgr_row_nv21(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int blocks,
+                              int whole) {
   int x = 0;
 #if HAZE_NEON
-  x = half_bgr_row_neon(luma, vu, bgr, width);
+  x = half_bgr_row_neon(luma, vu, bgr, whole);
 #elif HAZE_X86
   if (const auto kernel = x86_kernel(half_bgr_row_avx2, half_bgr_row_avx512))
-    x = kernel(luma, vu, bgr, width);
+    x = kernel(luma, vu, bgr, whole);
+#else
+  (void)whole;
 #endif
-  half_bgr_row_portable<2>(luma, vu, vu + 1, bgr, x, width);
+  half_bgr_row_portable<2>(luma, vu, vu + 1, bgr, x, blocks);
 }
 
 }  // namespace haze::color

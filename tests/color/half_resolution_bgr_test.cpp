@@ -303,6 +303,22 @@ TEST(HalfResolutionBgr, ReadsNothingPastTheLastRows) {
   }
 }
 
+// An odd width ends in a block of one column, an odd height in one of one row: the image may end with
+// that byte, whole steps of blocks or not.
+TEST(HalfResolutionBgr, OddSizesReadNothingPastTheLastLuma) {
+  Random random(test_seed());
+  for (int half_width = 1; half_width <= 200; ++half_width) {
+    const int width = 2 * half_width - 1;
+    PageEndBuffer<uint8_t> luma(make_image(random, Mood::kNoise, width, 3));
+    PageEndBuffer<uint8_t> vu(make_image(random, Mood::kNoise, 2 * half_width, 2));
+    std::vector<uint8_t> want(3 * area(half_width, 2));
+    reference::half_bgr_nv21(luma.data(), vu.data(), want.data(), width, 3);
+    PageEndBuffer<uint8_t> bgr(want.size());
+    xYCrCb2BGRPreview_NV21(luma.data(), vu.data(), bgr.data(), width, 3);
+    EXPECT_TRUE(bytes_match(bgr, want, {{"width", width}}));
+  }
+}
+
 TEST(HalfResolutionBgr, EmptySizesWriteNothing) {
   const int sizes[][2] = {{0, 0},   {0, 4},       {4, 0},       {-2, 4},  {4, -2},
                           {-4, -4}, {-8, -8},     {-1, -1},     {16, -1}, {-16, 1},
