@@ -23,6 +23,7 @@ struct Case {
   std::function<Bytes()> output;  // what run() left, compared between the CPU levels
   std::string peer_name;          // empty if there is none
   std::function<void()> peer;     // the best general-purpose function for the same work
+  Size frame = {};                // that it belongs to; none for the threaded stages
 };
 
 // Each appends the cases of one folder for a frame of this size.
@@ -31,5 +32,8 @@ void add_color_cases(Size frame, std::vector<Case>& cases);
 void add_filter_cases(Size frame, std::vector<Case>& cases);
 void add_estimate_cases(Size frame, std::vector<Case>& cases);
 void add_recover_cases(Size frame, std::vector<Case>& cases);
+
+// Stages with threads at sizes of their own; their peer is the same work on one thread.
+void add_thread_cases(std::vector<Case>& cases);
 
 }  // namespace haze::bench

@@ -127,12 +127,6 @@ void add_maps(Size size, std::vector<Case>& cases) {
   };
   cases.push_back(
       {"min and max maps of BGR", size, run, output_of(run, least, most), "OpenCV", peer});
-  const auto threaded = [=] {
-    CalculateMaxMinChannelPreview(image->data(), least->data(), most->data(), size.width,
-                                  size.height, 0);
-  };
-  cases.push_back({"min and max maps, 8 threads", size, threaded, output_of(threaded, least, most),
-                   "OpenCV", peer});
 }
 
 }  // namespace

@@ -37,12 +37,6 @@ void add_transmission(Size size, std::vector<Case>& cases) {
     cv::min(*t, 158, *t);
   };
   cases.push_back({"transmission map", size, run, output(run), "OpenCV", peer});
-  const auto threaded = [=] {
-    CalculateTChannelPreview(mean->data(), minimum->data(), codes->data(), size.width, size.height,
-                             768, 210, 0);
-  };
-  cases.push_back(
-      {"transmission map, 8 threads", size, threaded, output(threaded), "OpenCV", peer});
 }
 
 void add_dark_channel(Size size, int radius, std::vector<Case>& cases) {
@@ -76,14 +70,8 @@ void add_dark_channel(Size size, int radius, std::vector<Case>& cases) {
     const int channel = 0;
     cv::calcHist(eroded.get(), 1, &channel, cv::noArray(), *counts, 1, &bins, &ranges);
   };
-  const std::string name = "dark channel, radius " + std::to_string(radius);
-  cases.push_back({name, size, run, output(run), "OpenCV erode + calcHist", peer});
-  const auto threaded = [=] {
-    CalculateDarkChannel_MultiThreadPreview(image->data(), dark->data(), histogram->data(),
-                                            size.width, size.height, radius, 0);
-  };
-  cases.push_back(
-      {name + ", 4 threads", size, threaded, output(threaded), "OpenCV erode + calcHist", peer});
+  cases.push_back({"dark channel, radius " + std::to_string(radius), size, run, output(run),
+                   "OpenCV erode + calcHist", peer});
 }
 
 void add_float_transmission(Size size, std::vector<Case>& cases) {

@@ -1,8 +1,10 @@
-// Times every operation beside its yardsticks:  haze_preview_bench [JSON-FILE] [--benchmark_...]
+// Times every operation beside its yardsticks:
+//   haze_preview_bench [JSON-FILE] [--level=avx2|portable] [--benchmark_...]
 #include <benchmark/benchmark.h>
 
 #include <cstdio>
 #include <cstring>
+#include <iterator>
 #include <opencv2/core.hpp>
 
 #include "bench/images.h"
@@ -82,23 +84,54 @@ bool verify(const std::vector<Case>& cases) {
   return equal;
 }
 
+// Takes the option out of the arguments; false if its value is unknown.
+bool limit_level(int& argc, char** argv) {
+  constexpr char kOption[] = "--level=";
+  constexpr size_t kLength = sizeof kOption - 1;
+  int kept = 0;
+  bool known = true;
+  for (int i = 0; i < argc; ++i) {
+    if (std::strncmp(argv[i], kOption, kLength) != 0) {
+      argv[kept++] = argv[i];
+      continue;
+    }
+#if HAZE_X86
+    if (std::strcmp(argv[i] + kLength, "avx2") == 0)
+      haze::limit_cpu_level(haze::CpuLevel::kAvx2);
+    else if (std::strcmp(argv[i] + kLength, "portable") == 0)
+      haze::limit_cpu_level(haze::CpuLevel::kPortable);
+    else
+      known = false;
+#endif
+  }
+  argc = kept;
+  return known;
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
   benchmark::Initialize(&argc, argv);
+  if (!limit_level(argc, argv)) {
+    std::fprintf(stderr, "--level: avx2 or portable\n");
+    return 2;
+  }
   cv::setNumThreads(1);
   std::vector<Case> cases;
   for (const Size frame : kFrames) {
+    const size_t first = cases.size();
     haze::bench::add_frame_cases(frame, cases);
     haze::bench::add_color_cases(frame, cases);
     haze::bench::add_filter_cases(frame, cases);
     haze::bench::add_estimate_cases(frame, cases);
     haze::bench::add_recover_cases(frame, cases);
+    for (size_t i = first; i < cases.size(); ++i) cases[i].frame = frame;
   }
+  haze::bench::add_thread_cases(cases);
   add_benchmarks(cases);
   haze::bench::Report report;
   benchmark::RunSpecifiedBenchmarks(&report);
-  report.print_table(cases);
+  report.print_tables(cases, {std::begin(kFrames), std::end(kFrames)});
   if (argc > 1 && !report.write_json(argv[1], cases)) {
     std::fprintf(stderr, "cannot write %s\n", argv[1]);
     return 1;

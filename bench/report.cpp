@@ -3,17 +3,14 @@
 #include <algorithm>
 #include <cstdio>
 #include <fstream>
+#include <thread>
 
+#include "bench/goals.h"
 #include "core/cpu_level.h"
 #include "haze_preview.h"
 
 namespace haze::bench {
 namespace {
-
-struct Times {
-  double median = 0;
-  double minimum = 0;
-};
 
 Times times_of(std::vector<double> runs) {
   if (runs.empty()) return {};
@@ -26,6 +23,14 @@ std::string cpu_model() {
   for (std::string line; std::getline(info, line);)
     if (line.rfind("model name", 0) == 0) return line.substr(line.find(':') + 2);
   return "unknown";
+}
+
+bool is_avx512() {
+#if HAZE_X86
+  return cpu_level() == CpuLevel::kAvx512;
+#else
+  return false;
+#endif
 }
 
 const char* level_name() {
@@ -41,16 +46,6 @@ const char* level_name() {
 #endif
   return "portable";
 }
-
-// Half-resolution cases belong to the frame of twice their size.
-Size frame_of(Size size) {
-  return size.width >= 640 && size.height >= 480 ? size : Size{2 * size.width, 2 * size.height};
-}
-
-// One row of the table: ours and its ratios to the yardsticks by minimum time.
-struct Row {
-  Times ours, portable, peer, copy;
-};
 
 double ratio(const Times& a, const Times& b) { return b.minimum > 0 ? a.minimum / b.minimum : 0; }
 
@@ -84,28 +79,52 @@ void Report::ReportRuns(const std::vector<Run>& runs) {
   std::fprintf(stderr, ".");
 }
 
-void Report::print_table(const std::vector<Case>& cases) const {
-  const auto times = [&](const std::string& name) {
-    const auto found = milliseconds_.find(name);
-    return found == milliseconds_.end() ? Times{} : times_of(found->second);
-  };
+Times Report::times(const std::string& name) const {
+  const auto found = milliseconds_.find(name);
+  return found == milliseconds_.end() ? Times{} : times_of(found->second);
+}
+
+void Report::print_row(const Case& c, Size frame) const {
+  const Times ours = times(benchmark_name(c, "ours"));
+  const double recovery = times("frame recovery, NV21/" + size_name(frame) + "/ours").minimum;
+  const Ratios ratios = {ratio(ours, times(copy_name(frame))),
+                         recovery > 0 ? ours.minimum / recovery : 0,
+                         ratio(times(benchmark_name(c, "peer")), ours),
+                         ratio(times(benchmark_name(c, "portable")), ours)};
+  std::printf("| %s | %s | %.4f | %.4f | %.2f | %.1f x | %s | ", c.operation.c_str(),
+              size_name(c.size).c_str(), ours.minimum, ours.median, ratios.copies, ratios.portable,
+              c.peer_name.c_str());
+  if (c.peer) std::printf("%.1f x ", ratios.peer);
+  // Goals are stated for the largest frame.
+  const Bounds bounds = frame.width == 1280 ? bounds_of(c.operation, is_avx512()) : Bounds{};
+  const std::string goal = describe(bounds);
+  std::printf("| %s | %s |\n", goal.c_str(),
+              goal == "-"               ? "-"
+              : reached(bounds, ratios) ? "yes"
+                                        : "no");
+}
+
+void Report::print_tables(const std::vector<Case>& cases, const std::vector<Size>& frames) const {
   std::printf("\n");
   for (const std::string& line : environment()) std::printf("%s\n", line.c_str());
   std::printf(
       "\nMinimum and median of interleaved runs in ms; ratios of minima from this run alone.\n\n"
       "| operation | size | min | median | x memcpy of the frame | faster than portable | peer | "
-      "faster than peer |\n|---|---|---|---|---|---|---|---|\n");
+      "faster than peer | goal | reached |\n|---|---|---|---|---|---|---|---|---|---|\n");
+  for (const Size frame : frames)
+    for (const Case& c : cases)
+      if (c.frame.width == frame.width && c.frame.height == frame.height) print_row(c, frame);
+  std::printf(
+      "\nThreads on %u cores: the same work, threaded and not.\n\n"
+      "| operation | size | min | median | faster than one thread |\n|---|---|---|---|---|\n",
+      std::thread::hardware_concurrency());
   for (const Case& c : cases) {
+    if (c.frame.width != 0) continue;
     const Times ours = times(benchmark_name(c, "ours"));
-    const Times peer = times(benchmark_name(c, "peer"));
-    std::printf("| %s | %s | %.4f | %.4f | %.2f | %.1f x | %s | ", c.operation.c_str(),
-                size_name(c.size).c_str(), ours.minimum, ours.median,
-                ratio(ours, times(copy_name(frame_of(c.size)))),
-                ratio(times(benchmark_name(c, "portable")), ours), c.peer_name.c_str());
-    if (c.peer)
-      std::printf("%.1f x |\n", ratio(peer, ours));
-    else
-      std::printf("|\n");
+    std::printf("| %s | %s | %.4f | %.4f | ", c.operation.c_str(),
+                c.peer ? size_name(c.size).c_str() : "", ours.minimum, ours.median);
+    if (c.peer) std::printf("%.2f x ", ratio(times(benchmark_name(c, "peer")), ours));
+    std::printf("|\n");
   }
 }
 

@@ -11,17 +11,25 @@
 
 namespace haze::bench {
 
+struct Times {
+  double median = 0;
+  double minimum = 0;
+};
+
 // Milliseconds of the repetitions of one benchmark, by its name.
 class Report : public benchmark::BenchmarkReporter {
  public:
   bool ReportContext(const Context& context) override;
   void ReportRuns(const std::vector<Run>& runs) override;
 
-  // Prints one row per case, in order.
-  void print_table(const std::vector<Case>& cases) const;
+  // Prints the table of the cases of each frame size, then that of the threaded stages.
+  void print_tables(const std::vector<Case>& cases, const std::vector<Size>& frames) const;
   bool write_json(const std::string& path, const std::vector<Case>& cases) const;
 
  private:
+  Times times(const std::string& name) const;
+  void print_row(const Case& c, Size frame) const;
+
   std::map<std::string, std::vector<double>> milliseconds_;
 };
 
