@@ -1,6 +1,7 @@
 // Per-pixel minimum and maximum of three interleaved channels, alone and in worker stripes.
 #include "color/channel_maps_kernels.h"
 #include "core/image_size.h"
+#include "core/shared_int.h"
 #include "core/stripes.h"
 #include "haze_preview.h"
 
@@ -30,8 +31,9 @@ void CalculateMaxMinChannel(unsigned char* src, unsigned char* dstMin, unsigned 
 void* CalMaxMinThreadPreview(void* arg) {
   const haze::StripeCode code = haze::decode_stripe(arg);
   if (!haze::is_stripe(code, kMaxMinThreads)) return nullptr;
-  const haze::PixelRange range(haze::even_stripe(gCalMaxMinHPreview, kMaxMinThreads, code.stripe),
-                               gCalMaxMinWPreview);
+  const int height = haze::load_shared(gCalMaxMinHPreview);
+  const haze::PixelRange range(haze::even_stripe(height, kMaxMinThreads, code.stripe),
+                               haze::load_shared(gCalMaxMinWPreview));
   haze::color::min_max_maps(gCalMaxMinSrcPreview[code.slot] + 3 * range.begin,
                             gCalMaxMinDstMinPreview[code.slot] + range.begin,
                             gCalMaxMinDstMaxPreview[code.slot] + range.begin, range.count);
@@ -44,16 +46,17 @@ int CalculateMaxMinChannelPreview(unsigned char* src, unsigned char* dstMin, uns
   gCalMaxMinSrcPreview[slot] = src;
   gCalMaxMinDstMinPreview[slot] = dstMin;
   gCalMaxMinDstMaxPreview[slot] = dstMax;
-  gCalMaxMinWPreview = w;
-  gCalMaxMinHPreview = h;
+  haze::store_shared(gCalMaxMinWPreview, w);
+  haze::store_shared(gCalMaxMinHPreview, h);
   return haze::run_stripes<kMaxMinThreads>(CalMaxMinThreadPreview, slot);
 }
 
 void* CalMCThreadPreview(void* arg) {
   const haze::StripeCode code = haze::decode_stripe(arg);
   if (!haze::is_stripe(code, kMinThreads)) return nullptr;
-  const haze::PixelRange range(haze::even_stripe(gCalMCHPreview, kMinThreads, code.stripe),
-                               gCalMCWPreview);
+  const int height = haze::load_shared(gCalMCHPreview);
+  const haze::PixelRange range(haze::even_stripe(height, kMinThreads, code.stripe),
+                               haze::load_shared(gCalMCWPreview));
   haze::color::min_map(gCalMCSrcPreview[code.slot] + 3 * range.begin,
                        gCalMCDstPreview[code.slot] + range.begin, range.count);
   return nullptr;
@@ -63,7 +66,7 @@ int CalculateMinChannelPreview(unsigned char* src, unsigned char* dst, int w, in
   if (!haze::is_slot(slot)) return 0;
   gCalMCSrcPreview[slot] = src;
   gCalMCDstPreview[slot] = dst;
-  gCalMCWPreview = w;
-  gCalMCHPreview = h;
+  haze::store_shared(gCalMCWPreview, w);
+  haze::store_shared(gCalMCHPreview, h);
   return haze::run_stripes<kMinThreads>(CalMCThreadPreview, slot);
 }

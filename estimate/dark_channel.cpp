@@ -4,6 +4,7 @@
 
 #include "core/image_size.h"
 #include "core/scratch.h"
+#include "core/shared_int.h"
 #include "core/stripes.h"
 #include "estimate/histogram.h"
 #include "filter/window_extremum.h"
@@ -24,6 +25,7 @@ using haze::filter::filter_columns;
 using haze::filter::filter_line;
 using haze::filter::filter_rows;
 using haze::filter::LeastByte;
+using haze::filter::search_lines;
 
 constexpr int kThreads = 4;
 static_assert(sizeof gHistPreview == haze::kSlots * kThreads * kBins * sizeof(int));
@@ -31,6 +33,13 @@ static_assert(sizeof gHistPreview == haze::kSlots * kThreads * kBins * sizeof(in
 // The histogram of one worker, as the signed counters that the column pass takes.
 int* worker_histogram(haze::StripeCode code) {
   return reinterpret_cast<int*>(gHistPreview + (code.slot * kThreads + code.stripe) * kBins);
+}
+
+// hist[v] grows by the number of bytes v in a stripe of columns.
+void count_columns(const uint8_t* image, int cols, int h, ptrdiff_t stride, int* hist) {
+  ByteCounts counts;
+  for (int y = 0; y < h; ++y) counts.add(image + y * stride, static_cast<size_t>(cols));
+  counts.add_to(hist);
 }
 
 }  // namespace
@@ -50,11 +59,9 @@ void getMCandHistPreview(unsigned char* src, unsigned char* dst, int* hist, int 
 
 void getMinChannel_verPreview(unsigned char* src, unsigned char* dst, int cols, int h, int r,
                               int* hist) {
-  const ptrdiff_t stride = gCalDCWPreview;
-  if (!filter_columns<LeastByte>(src, dst, cols, h, stride, r)) return;
-  ByteCounts counts;
-  for (int y = 0; y < h; ++y) counts.add(dst + y * stride, static_cast<size_t>(cols));
-  counts.add_to(hist);
+  const ptrdiff_t stride = haze::load_shared(gCalDCWPreview);
+  if (filter_columns<LeastByte>(src, dst, cols, h, stride, r))
+    count_columns(dst, cols, h, stride, hist);
 }
 
 void CalculateDarkChannelPreview(unsigned char* src, unsigned char* dst, int* hist, int w, int h,
@@ -72,23 +79,36 @@ void CalculateDarkChannelPreview(unsigned char* src, unsigned char* dst, int* hi
 void* CalDCThread_horPreview(void* arg) {
   const haze::StripeCode code = haze::decode_stripe(arg);
   if (!haze::is_stripe(code, kThreads)) return nullptr;
-  const int width = gCalDCWPreview;
-  const haze::StripeRange rows = haze::even_stripe(gCalDCHPreview, kThreads, code.stripe);
+  const int width = haze::load_shared(gCalDCWPreview);
+  const int radius = haze::load_shared(gCalDCRPreview);
+  const haze::StripeRange rows =
+      haze::even_stripe(haze::load_shared(gCalDCHPreview), kThreads, code.stripe);
+  const int count = rows.end - rows.begin;
+  if (width < 1 || count < 1 || radius < 0) return nullptr;
   const size_t begin = haze::pixel_count(width, rows.begin);
-  filter_rows<LeastByte>(gCalDCSrcPreview[code.slot] + begin, gCalDCDstPreview[code.slot] + begin,
-                         width, rows.end - rows.begin, width, gCalDCRPreview);
+  const uint8_t* const src = gCalDCSrcPreview[code.slot] + begin;
+  uint8_t* const dst = gCalDCDstPreview[code.slot] + begin;
+  if (!filter_rows<LeastByte>(src, dst, width, count, width, radius))
+    search_lines<LeastByte>(src, dst, {count, width, width, 1}, radius);
   return nullptr;
 }
 
 void* CalDCThread_verPreview(void* arg) {
   const haze::StripeCode code = haze::decode_stripe(arg);
   if (!haze::is_stripe(code, kThreads)) return nullptr;
-  const haze::StripeRange columns = haze::even_stripe(gCalDCWPreview, kThreads, code.stripe);
+  const int width = haze::load_shared(gCalDCWPreview);
+  const int height = haze::load_shared(gCalDCHPreview);
+  const int radius = haze::load_shared(gCalDCRPreview);
+  const haze::StripeRange columns = haze::even_stripe(width, kThreads, code.stripe);
+  const int count = columns.end - columns.begin;
   int* const histogram = worker_histogram(code);
   memset(histogram, 0, kBins * sizeof *histogram);
-  getMinChannel_verPreview(gCalDCSrcPreview[code.slot] + columns.begin,
-                           gCalDCDstPreview[code.slot] + columns.begin, columns.end - columns.begin,
-                           gCalDCHPreview, gCalDCRPreview, histogram);
+  if (count < 1 || height < 1 || radius < 0) return nullptr;
+  const uint8_t* const src = gCalDCSrcPreview[code.slot] + columns.begin;
+  uint8_t* const dst = gCalDCDstPreview[code.slot] + columns.begin;
+  if (!filter_columns<LeastByte>(src, dst, count, height, width, radius))
+    search_lines<LeastByte>(src, dst, {count, 1, height, width}, radius);
+  count_columns(dst, count, height, width, histogram);
   return nullptr;
 }
 
@@ -97,9 +117,9 @@ void CalculateDarkChannel_MultiThreadPreview(unsigned char* src, unsigned char* 
   if (!haze::is_slot(slot) || haze::pixel_count(w, h) == 0 || r < 0) return;
   haze::Scratch<uint8_t> rows(haze::pixel_count(w, h));
   if (!rows) return;
-  gCalDCWPreview = w;
-  gCalDCHPreview = h;
-  gCalDCRPreview = r;
+  haze::store_shared(gCalDCWPreview, w);
+  haze::store_shared(gCalDCHPreview, h);
+  haze::store_shared(gCalDCRPreview, r);
   gCalDCSrcPreview[slot] = src;
   gCalDCDstPreview[slot] = rows.data();
   haze::run_stripes<kThreads>(CalDCThread_horPreview, slot);

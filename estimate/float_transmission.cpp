@@ -56,13 +56,18 @@ void largest_transmissions(const uint8_t* pixels, const float (&scales)[3], floa
 void EstimateTPreview(unsigned char* src, unsigned char* A, float* t, float* tRaw, int w, int h,
                       int level) {
   const size_t count = haze::pixel_count(w, h);
+  if (count == 0) return;
+  // All memory at first, so that either both maps are written or none.
   haze::Scratch<float> rows(count);
-  if (count == 0 || !rows) return;
+  haze::filter::WindowLines<MostFloat> line(w, kRadius, 1);
+  haze::filter::WindowLines<MostFloat> columns(h, kRadius,
+                                               haze::filter::column_bundle<MostFloat>(w));
+  if (!rows || !line || !columns) return;
   const float strength = strength_of(level);
   float scales[3];
   for (int channel = 0; channel < 3; ++channel)
     scales[channel] = strength / static_cast<float>(A[channel]);
   largest_transmissions(src, scales, tRaw, count);
-  if (haze::filter::filter_rows<MostFloat>(tRaw, rows.data(), w, h, w, kRadius))
-    haze::filter::filter_columns<MostFloat>(rows.data(), t, w, h, w, kRadius);
+  haze::filter::filter_rows(line, tRaw, rows.data(), w, h, w);
+  haze::filter::filter_columns(columns, rows.data(), t, w, h, w);
 }

@@ -1,6 +1,7 @@
 // Transmission map from the smoothed minimum channel: t = 1 - w * dark channel / A, with the mean
 // of the minimum channel, bounded by the minimum itself, in place of a minimum filter.
 #include "core/image_size.h"
+#include "core/shared_int.h"
 #include "core/stripes.h"
 #include "estimate/transmission_kernels.h"
 #include "haze_preview.h"
@@ -46,8 +47,9 @@ void CalculateTChannelPreviewNeon(unsigned char* meanMap, unsigned char* minMap,
 void* CalTThreadPreview(void* arg) {
   const haze::StripeCode code = haze::decode_stripe(arg);
   if (!haze::is_stripe(code, kThreads)) return nullptr;
-  const haze::PixelRange range(haze::even_stripe(gCalTHPreview, kThreads, code.stripe),
-                               gCalTWPreview);
+  const int height = haze::load_shared(gCalTHPreview);
+  const haze::PixelRange range(haze::even_stripe(height, kThreads, code.stripe),
+                               haze::load_shared(gCalTWPreview));
   const uint8_t* const mean = gCalTSrcPreview[code.slot] + range.begin;
   const uint8_t* const minimum = gCalTSrc1Preview[code.slot] + range.begin;
   uint8_t* const codes = gCalTDstPreview[code.slot] + range.begin;
@@ -67,7 +69,7 @@ void CalculateTChannelPreview(unsigned char* meanMap, unsigned char* minMap,
   gCalTDstPreview[slot] = transmission;
   gAlpha[slot] = strengthQ8;
   gAA[slot] = atmosphericLight;
-  gCalTWPreview = width;
-  gCalTHPreview = height;
+  haze::store_shared(gCalTWPreview, width);
+  haze::store_shared(gCalTHPreview, height);
   haze::run_stripes<kThreads>(CalTThreadPreview, slot);
 }

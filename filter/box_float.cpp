@@ -1,4 +1,6 @@
 // Mean filters of float planes by running sums.
+#include "filter/box_float.h"
+
 #include "core/image_size.h"
 #include "core/scratch.h"
 #include "filter/box_float_kernels.h"
@@ -84,14 +86,31 @@ struct Mean {
 };
 
 template <typename... Terms>
-void means_of(int width, int height, int radius, Mean<Terms>... means) {
-  if (!haze::holds_window(width, height, radius)) return;
+bool means_of(int width, int height, int radius, Mean<Terms>... means) {
+  if (!haze::holds_window(width, height, radius)) return false;
   haze::Scratch<float> sums(kGroup * static_cast<size_t>(width));
-  if (!sums) return;
+  if (!sums) return false;
   (mean_of(means.term, means.dst, width, height, radius, sums.data()), ...);
+  return true;
 }
 
 }  // namespace
+
+namespace haze::filter {
+
+bool two_means(const float* a, const float* b, float* mean_a, float* mean_b, int width, int height,
+               int radius) {
+  return means_of(width, height, radius, Mean<PlaneTerm>{{a}, mean_a},
+                  Mean<PlaneTerm>{{b}, mean_b});
+}
+
+bool four_means(const float* a, const float* b, float* mean_a, float* mean_b, float* mean_ab,
+                float* mean_bb, int width, int height, int radius) {
+  return means_of(width, height, radius, Mean<PlaneTerm>{{a}, mean_a}, Mean<PlaneTerm>{{b}, mean_b},
+                  Mean<ProductTerm>{{a, b}, mean_ab}, Mean<ProductTerm>{{b, b}, mean_bb});
+}
+
+}  // namespace haze::filter
 
 void AverageFilter_fPreview(float* src, float* dst, int width, int height, int radius) {
   means_of(width, height, radius, Mean<PlaneTerm>{{src}, dst});
@@ -107,11 +126,10 @@ void AverageFilter_fPreview(float* a, float* b, float* dst, int width, int heigh
 
 void AverageFilter_f_Out2Preview(float* a, float* b, float* meanA, float* meanB, int width,
                                  int height, int radius) {
-  means_of(width, height, radius, Mean<PlaneTerm>{{a}, meanA}, Mean<PlaneTerm>{{b}, meanB});
+  haze::filter::two_means(a, b, meanA, meanB, width, height, radius);
 }
 
 void AverageFilter_f_Out4Preview(float* a, float* b, float* meanA, float* meanB, float* meanAB,
                                  float* meanBB, int width, int height, int radius) {
-  means_of(width, height, radius, Mean<PlaneTerm>{{a}, meanA}, Mean<PlaneTerm>{{b}, meanB},
-           Mean<ProductTerm>{{a, b}, meanAB}, Mean<ProductTerm>{{b, b}, meanBB});
+  haze::filter::four_means(a, b, meanA, meanB, meanAB, meanBB, width, height, radius);
 }

@@ -2,6 +2,7 @@
 // output.
 #include "core/image_size.h"
 #include "core/scratch.h"
+#include "filter/box_float.h"
 #include "filter/guided_kernels.h"
 #include "haze_preview.h"
 
@@ -14,14 +15,12 @@ void GuidedFilterPreview(float* p, float* I, unsigned char* out, int w, int h, i
   float* const mean_plane = mean_guide + count;
   float* const products = mean_plane + count;
   float* const squares = products + count;
-  AverageFilter_f_Out4Preview(I, p, mean_guide, mean_plane, products, squares, w, h, r);
-
+  if (!haze::filter::four_means(I, p, mean_guide, mean_plane, products, squares, w, h, r)) return;
   haze::filter::fit_model(mean_guide, mean_plane, products, squares, count);
   float* const slopes = products;
   float* const offsets = squares;
   float* const mean_slopes = mean_guide;
   float* const mean_offsets = mean_plane;
-  AverageFilter_f_Out2Preview(slopes, offsets, mean_slopes, mean_offsets, w, h, r);
-
+  if (!haze::filter::two_means(slopes, offsets, mean_slopes, mean_offsets, w, h, r)) return;
   haze::filter::refined_codes(I, mean_slopes, mean_offsets, out, count);
 }

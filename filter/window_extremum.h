@@ -161,39 +161,86 @@ inline void filter_line(const typename Extremum::Value* src, typename Extremum::
   filter_line<Extremum>(src, dst, samples, dst_stride, radius, [](typename Extremum::Value) {});
 }
 
-// All rows of an image whose rows lie `stride` samples apart.
+// All rows of an image whose rows lie `stride` samples apart, one after the other in `line`.
+template <typename Extremum>
+inline void filter_rows(WindowLines<Extremum>& line, const typename Extremum::Value* src,
+                        typename Extremum::Value* dst, int width, int height, ptrdiff_t stride) {
+  const size_t bytes = static_cast<size_t>(width) * sizeof *src;
+  for (int y = 0; y < height; ++y) {
+    memcpy(line.sample(0), src + y * stride, bytes);
+    memcpy(dst + y * stride, line.filter(), bytes);
+  }
+}
+
+// The same in memory of its own; false, with nothing written, if there is none.
 template <typename Extremum>
 inline bool filter_rows(const typename Extremum::Value* src, typename Extremum::Value* dst,
                         int width, int height, ptrdiff_t stride, int radius) {
   if (width < 1 || height < 1 || radius < 0) return false;
   WindowLines<Extremum> line(width, radius, 1);
   if (!line) return false;
-  const size_t bytes = static_cast<size_t>(width) * sizeof *src;
-  for (int y = 0; y < height; ++y) {
-    memcpy(line.sample(0), src + y * stride, bytes);
-    memcpy(dst + y * stride, line.filter(), bytes);
-  }
+  filter_rows(line, src, dst, width, height, stride);
   return true;
 }
 
-// All columns, in bundles of a few cache lines: wide enough to read whole lines, narrow enough to
-// stay in the second-level cache.
+// Columns that are filtered side by side: a few cache lines, wide enough to read whole lines,
+// narrow enough to stay in the second-level cache.
 template <typename Extremum>
-inline bool filter_columns(const typename Extremum::Value* src, typename Extremum::Value* dst,
-                           int width, int height, ptrdiff_t stride, int radius) {
-  constexpr int kBundle = 512 / sizeof(typename Extremum::Value);
-  if (width < 1 || height < 1 || radius < 0) return false;
-  WindowLines<Extremum> columns(height, radius, min(kBundle, width));
-  if (!columns) return false;
-  for (int x = 0; x < width; x += kBundle) {
-    const int bundle = min(kBundle, width - x);
+constexpr int column_bundle(int width) {
+  return min(static_cast<int>(512 / sizeof(typename Extremum::Value)), width);
+}
+
+// All columns, column_bundle() of them at a time in `columns`.
+template <typename Extremum>
+inline void filter_columns(WindowLines<Extremum>& columns, const typename Extremum::Value* src,
+                           typename Extremum::Value* dst, int width, int height, ptrdiff_t stride) {
+  const int most = column_bundle<Extremum>(width);
+  for (int x = 0; x < width; x += most) {
+    const int bundle = min(most, width - x);
     columns.narrow_to(bundle);
     const size_t bytes = static_cast<size_t>(bundle) * sizeof *src;
     for (int y = 0; y < height; ++y) memcpy(columns.sample(y), src + y * stride + x, bytes);
     const typename Extremum::Value* const extrema = columns.filter();
     for (int y = 0; y < height; ++y) memcpy(dst + y * stride + x, extrema + y * bundle, bytes);
   }
+}
+
+// The same in memory of its own; false, with nothing written, if there is none.
+template <typename Extremum>
+inline bool filter_columns(const typename Extremum::Value* src, typename Extremum::Value* dst,
+                           int width, int height, ptrdiff_t stride, int radius) {
+  if (width < 1 || height < 1 || radius < 0) return false;
+  WindowLines<Extremum> columns(height, radius, column_bundle<Extremum>(width));
+  if (!columns) return false;
+  filter_columns(columns, src, dst, width, height, stride);
   return true;
+}
+
+// Lines of samples in an image, along the rows or down the columns.
+struct ImageLines {
+  int count;
+  ptrdiff_t step;  // from one line to the next
+  int samples;     // of a line
+  ptrdiff_t sample_step;
+};
+
+// Extrema of all lines without any memory, each window searched through: for workers, which have no
+// way to tell that memory is short.
+template <typename Extremum>
+inline void search_lines(const typename Extremum::Value* src, typename Extremum::Value* dst,
+                         ImageLines lines, int radius) {
+  for (int line = 0; line < lines.count; ++line) {
+    const ptrdiff_t start = line * lines.step;
+    for (int i = 0; i < lines.samples; ++i) {
+      // radius is compared before it is added: it may be any number from 0 on.
+      const int first = radius < i ? i - radius : 0;
+      const int last = radius < lines.samples - 1 - i ? i + radius : lines.samples - 1;
+      typename Extremum::Value extremum = Extremum::kNeutral;
+      for (int j = first; j <= last; ++j)
+        extremum = Extremum::combine(extremum, src[start + j * lines.sample_step]);
+      dst[start + i * lines.sample_step] = extremum;
+    }
+  }
 }
 
 }  // namespace haze::filter

@@ -386,7 +386,8 @@ extern HAZE_PREVIEW_API int gCalTHPreview;                   // height
 HAZE_PREVIEW_API void CalculateDarkChannelPreview(unsigned char* src, unsigned char* dst, int* hist,
                                                   int w, int h, int r);
 
-// By four threads for the rows, then four for the columns. hist is overwritten.
+// By four threads for the rows, then four for the columns. hist is overwritten. A thread that gets
+// no memory searches every window of its stripe.
 HAZE_PREVIEW_API void CalculateDarkChannel_MultiThreadPreview(unsigned char* src,
                                                               unsigned char* dst, int* hist, int w,
                                                               int h, int r, int slot);

@@ -1,5 +1,6 @@
 // Half-resolution BGR of preview frames by eight threads, and float planes at twice their size.
 #include "core/scratch.h"
+#include "core/shared_int.h"
 #include "core/stripes.h"
 #include "haze_preview.h"
 
@@ -34,24 +35,26 @@ void zoom_row(const float* src, float* dst, int width) {
 // Converts rows of the frame that a slot describes. Both bounds are even.
 void convert_rows(int slot, haze::StripeRange rows) {
   if (rows.end <= rows.begin) return;
-  const ptrdiff_t width = gZoomOutWPreview;
-  const ptrdiff_t height = gZoomOutHPreview;
+  const int columns = haze::load_shared(gZoomOutWPreview);
+  const ptrdiff_t width = columns;
+  const ptrdiff_t height = haze::load_shared(gZoomOutHPreview);
   unsigned char* const frame = gZoomOutSrcPreview[slot];
   unsigned char* const luma = frame + width * rows.begin;
   unsigned char* const bgr = gZoomOutDstPreview[slot] + width * rows.begin / 4 * 3;
   if (gPerviewFormat == kInputFormatPlanar) {
-    xYCrCb2BGRPreview(luma, frame + width * height + width / 2 * (rows.begin / 2), bgr,
-                      gZoomOutWPreview, rows.end - rows.begin);
+    xYCrCb2BGRPreview(luma, frame + width * height + width / 2 * (rows.begin / 2), bgr, columns,
+                      rows.end - rows.begin);
   } else {
-    xYCrCb2BGRPreview_NV21(luma, frame + width * height + width * (rows.begin / 2), bgr,
-                           gZoomOutWPreview, rows.end - rows.begin);
+    xYCrCb2BGRPreview_NV21(luma, frame + width * height + width * (rows.begin / 2), bgr, columns,
+                           rows.end - rows.begin);
   }
 }
 
 // Odd sides would end in blocks whose chroma the frame does not have.
 bool has_frame() {
-  return gZoomOutWPreview >= 1 && gZoomOutHPreview >= 1 && gZoomOutWPreview % 2 == 0 &&
-         gZoomOutHPreview % 2 == 0;
+  const int width = haze::load_shared(gZoomOutWPreview);
+  const int height = haze::load_shared(gZoomOutHPreview);
+  return width >= 1 && height >= 1 && width % 2 == 0 && height % 2 == 0;
 }
 
 // Worker beside all others of its slot: as ZoomOutThreadPreview, but stripe 3 leaves the rows out
@@ -60,9 +63,10 @@ void* convert_own_rows(void* arg) {
   const haze::StripeCode code = haze::decode_stripe(arg);
   if (code.stripe != 3) return ZoomOutThreadPreview(arg);
   if (!has_frame()) return nullptr;
-  const haze::StripeRange rows = zoom_stripe(gZoomOutHPreview, 3);
-  const int next_begin = zoom_stripe(gZoomOutHPreview, 4).begin;
-  const int last_end = zoom_stripe(gZoomOutHPreview, 7).end;
+  const int height = haze::load_shared(gZoomOutHPreview);
+  const haze::StripeRange rows = zoom_stripe(height, 3);
+  const int next_begin = zoom_stripe(height, 4).begin;
+  const int last_end = zoom_stripe(height, 7).end;
   convert_rows(code.slot, {rows.begin, next_begin});
   convert_rows(code.slot, {last_end, rows.end});
   return nullptr;
@@ -73,7 +77,7 @@ void* convert_own_rows(void* arg) {
 void* ZoomOutThreadPreview(void* arg) {
   const haze::StripeCode code = haze::decode_stripe(arg);
   if (haze::is_stripe(code, kThreads) && has_frame())
-    convert_rows(code.slot, zoom_stripe(gZoomOutHPreview, code.stripe));
+    convert_rows(code.slot, zoom_stripe(haze::load_shared(gZoomOutHPreview), code.stripe));
   return nullptr;
 }
 
@@ -81,8 +85,8 @@ void ZoomOutImgPreview(unsigned char* src, unsigned char* dst, int width, int he
   if (!haze::is_slot(slot)) return;
   gZoomOutSrcPreview[slot] = src;
   gZoomOutDstPreview[slot] = dst;
-  gZoomOutWPreview = width;
-  gZoomOutHPreview = height;
+  haze::store_shared(gZoomOutWPreview, width);
+  haze::store_shared(gZoomOutHPreview, height);
   haze::run_stripes<kThreads>(convert_own_rows, slot);
 }
 

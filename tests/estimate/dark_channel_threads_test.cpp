@@ -255,7 +255,6 @@ TEST(ThreadedDarkChannel, EmptySizesAndNegativeRadiiWriteNothing) {
 }
 
 TEST(ThreadedDarkChannel, AllSlotsAtOnce) {
-  if (kThreadSanitizer) GTEST_SKIP() << "concurrent stores of equal sizes are reported";
   constexpr int kWidth = 61;
   constexpr int kHeight = 53;
   constexpr int kRadius = 4;

@@ -60,7 +60,11 @@ float inverse_light(int light) {
 void ReferenceSession::init(int new_format, int width, int height) {
   format = new_format;
   if (open) return;
-  block.assign(static_cast<size_t>(width) * static_cast<size_t>(height) * 4, 0);
+  // Four bytes per pixel, modulo 2^32; from 2^31 on it is more than there is.
+  const uint64_t pixels = static_cast<uint64_t>(static_cast<int64_t>(width) * height);
+  const uint64_t bytes = pixels % (uint64_t{1} << 30) * 4;
+  if (bytes >= uint64_t{1} << 31) return;
+  block.assign(static_cast<size_t>(bytes), 0);
   open = true;
   block_is_hosts = false;
 }

@@ -32,7 +32,7 @@ class ReferenceSession {
  public:
   static constexpr int kCacheRowBytes = 640;
 
-  // Sizes must be positive and width * height * 4 must fit 32 bits.
+  // Any sizes.
   void init(int new_format, int width, int height);
   void release();
 

@@ -29,19 +29,6 @@ inline std::vector<int> codes_out_of_range(int stripes) {
   return codes;
 }
 
-// Concurrent calls store equal sizes into the same globals. That is allowed, yet the thread sanitizer reports it.
-#if defined(__SANITIZE_THREAD__)
-constexpr bool kThreadSanitizer = true;
-#elif defined(__has_feature)
-#if __has_feature(thread_sanitizer)
-constexpr bool kThreadSanitizer = true;
-#else
-constexpr bool kThreadSanitizer = false;
-#endif
-#else
-constexpr bool kThreadSanitizer = false;
-#endif
-
 // Calls `work(slot)` for all slots on threads of their own.
 template <class Work>
 void in_all_slots_at_once(const Work& work) {
