@@ -3,3 +3,7 @@
 if(BUILD_SHARED_LIBS AND NOT HAZE_PREVIEW_SANITIZERS)
   target_link_options(haze_preview PRIVATE -Wl,--as-needed -Wl,--no-undefined)
 endif()
+# Pages of 64-bit Android may have 16 KB.
+if(ANDROID AND CMAKE_SYSTEM_PROCESSOR MATCHES "^(aarch64|x86_64)$")
+  target_link_options(haze_preview PRIVATE -Wl,-z,max-page-size=16384)
+endif()

@@ -66,7 +66,7 @@ class LongRun {
   void turn(int number) {
     if (number == 0 || random_.between(0, 9) == 0) open();
     if (random_.between(0, 9) == 0) set_format();
-    const std::vector<uint8_t>& frame = sizes_->frames[random_.next() % sizes_->frames.size()];
+    const std::vector<uint8_t>& frame = sizes_->frames[pick(sizes_->frames.size())];
     const int level = random_.between(-20, 260);
     actual_ = wanted_ = frame;
     RemoveHazePreview(actual_.data(), sizes_->width, sizes_->height, 0, level);
@@ -85,9 +85,13 @@ class LongRun {
   uint64_t wanted() const { return wanted_digest_.value(); }
 
  private:
+  size_t pick(size_t count) {
+    return static_cast<size_t>(random_.between(0, static_cast<int>(count) - 1));
+  }
+
   void open() {
     close();
-    sizes_ = &all_[random_.next() % all_.size()];
+    sizes_ = &all_[pick(all_.size())];
     format_ = random_.between(0, 1) == 0 ? 0 : 3;
     InitHazePreviewFormat(static_cast<INPUT_FORMAT>(format_), sizes_->width, sizes_->height);
     reference_.init(format_, sizes_->width, sizes_->height);

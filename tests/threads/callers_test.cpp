@@ -76,7 +76,8 @@ TEST(Callers, EightOfAnyReentrantBlocks) {
       const std::vector<uint8_t> bytes = draw_choices(random);
       Choices choices(bytes.data(), bytes.size(), lane);
       calls.push_back(std::make_unique<Call>(Placement::kPageEnd));
-      const size_t which = static_cast<size_t>(random.next() % blocks.size());
+      const size_t which =
+          static_cast<size_t>(random.between(0, static_cast<int>(blocks.size()) - 1));
       blocks[which].draw(choices, *calls.back());
     }
     run_at_once(calls, "reentrant blocks");
