@@ -9,7 +9,7 @@
 #include "media/filter_pipe.h"
 #include "media/reader.h"
 #include "media/writer_picture.h"
-#include "options.h"
+#include "output_kind.h"
 #include "picture_metrics.h"
 
 namespace dehaze {

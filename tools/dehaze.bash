@@ -8,15 +8,18 @@ _dehaze_options() {
 }
 
 _dehaze() {
-  local word=${COMP_WORDS[COMP_CWORD]} before=
+  local word=${COMP_WORDS[COMP_CWORD]} before= words=
   [ "$COMP_CWORD" -eq 0 ] || before=${COMP_WORDS[COMP_CWORD - 1]}
   COMPREPLY=()
   case $before in
-    --level | --max-frames) return ;; # numbers
+    --level | --max-frames | --jobs | --raw) return ;; # numbers
+    --strength) words=auto ;;
+    --engine) words='photo preview' ;;
+    --show) words='map compare light' ;;
+    --raw-output) words='i420 yv12 nv12 nv21' ;;
   esac
-  case $word in
-    -*) mapfile -t COMPREPLY < <(compgen -W "$(_dehaze_options "$1")" -- "$word") ;;
-  esac
+  if [ -z "$words" ] && [[ $word == -* ]]; then words=$(_dehaze_options "$1"); fi
+  [ -z "$words" ] || mapfile -t COMPREPLY < <(compgen -W "$words" -- "$word")
 }
 
 # Where nothing is offered, bash completes the names of files.

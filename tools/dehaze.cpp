@@ -1,58 +1,43 @@
 // dehaze: takes haze, fog and smog out of pictures and videos.
-#include <unistd.h>
-
 #include <csignal>
 #include <cstdio>
 #include <exception>
 #include <new>
 #include <optional>
-#include <string>
 
+#include "batch.h"
 #include "console.h"
-#include "dehaze_picture.h"
-#include "dehaze_video.h"
 #include "errors.h"
-#include "find_light.h"
 #include "interrupt.h"
 #include "media/av_error.h"
-#include "media/reader.h"
+#include "one_file.h"
 #include "options.h"
-#include "output_file.h"
+#include "outcome.h"
+#include "print_line.h"
 #include "show.h"
 
 namespace dehaze {
 namespace {
 
-bool is_light_only(const Options& options) { return options.output.empty(); }
-
-void run(const Options& options) {
-  if (is_light_only(options)) {
-    // Nothing is written.
-  } else if (options.output != "-") {
-    check_output_path(options.input, options.output, options.force);
-  } else if (isatty(STDOUT_FILENO)) {
-    throw UsageError("standard output is a terminal; send the Y4M stream to a file or a program");
+ExitStatus run_single(const Options& options) {
+  // Where the frames go to standard output, the results take the place of the notes.
+  const bool frames_on_stdout = options.output == "-";
+  TerminalConsole console(options.quiet || (options.json && frames_on_stdout));
+  const FileResult result = process_file(options, console);
+  if (options.json) {
+    print_line(frames_on_stdout ? stderr : stdout, to_json(result));
+    if (frames_on_stdout) return result.exit_status;
   }
-  Console console(options.quiet);
-  Reader reader(options.input);
-  RunReport report;
-  if (is_light_only(options)) {
-    report = find_light(reader, options, console);
-  } else if (is_picture_kind(options.output_kind)) {
-    if (!reader.is_picture()) {
-      console.note("the input is a video; its first frame becomes the picture");
-    }
-    report = dehaze_picture(reader, options, console);
-  } else if (reader.is_picture()) {
-    throw Error(reader.path() +
-                ": a picture cannot become a video; name the output .jpg, .png or .webp");
-  } else {
-    report = dehaze_video(reader, options, console);
+  if (result.status != FileStatus::kDone) {
+    print_error(result.message);
+    return result.exit_status;
   }
-  console.clear_progress();
-  if (options.engine.show == Show::kLight) std::puts(describe(report.findings).c_str());
+  if (options.engine.show == Show::kLight && !options.json) {
+    print_line(stdout, describe(result.outcome->report.findings));
+  }
   // Asked for by name, so not subject to --quiet.
-  if (options.timing) print_error("time per frame: " + describe(report.times));
+  if (options.timing) print_info(timing_text(result));
+  return kExitDone;
 }
 
 int guarded_main(int argc, char** argv) {
@@ -60,11 +45,11 @@ int guarded_main(int argc, char** argv) {
     watch_signals();
     capture_av_log();
     const std::optional<Options> options = parse_options(argc, argv);
-    if (options) run(*options);
-    return kExitDone;
+    if (!options) return kExitDone;
+    return options->is_batch() ? run_batch(*options) : run_single(*options);
   } catch (const Interrupted& interrupted) {
     const int number = interrupted.signal_number();
-    if (number != SIGPIPE) print_error("interrupted; no output file was left behind");
+    if (number != SIGPIPE) print_error("interrupted; no unfinished file was left behind");
     return kExitSignalBase + number;
   } catch (const UsageError& error) {
     print_error(error.what());

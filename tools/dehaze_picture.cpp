@@ -31,7 +31,7 @@ void copy_icc_profile(const AVFrame& from, AVFrame* to, OutputKind kind, Console
 
 }  // namespace
 
-RunReport dehaze_picture(Reader& reader, const Options& options, Console& console) {
+Outcome dehaze_picture(Reader& reader, const Options& options, Console& console) {
   const FramePtr frame = make_frame();
   if (!reader.read_frame(frame.get())) throw Error(reader.path() + ": holds no picture");
 
@@ -62,7 +62,7 @@ RunReport dehaze_picture(Reader& reader, const Options& options, Console& consol
   write_picture(*picture, options.output_kind, file.temporary_path());
   throw_if_interrupted();
   file.commit();
-  return path.engine().report();
+  return {path.engine().report(), picture->width, picture->height, 1};
 }
 
 }  // namespace dehaze

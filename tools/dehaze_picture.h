@@ -3,15 +3,15 @@
 #define TOOLS_DEHAZE_PICTURE_H
 
 #include "console.h"
-#include "engine.h"
 #include "media/reader.h"
 #include "options.h"
+#include "outcome.h"
 
 namespace dehaze {
 
 // Of a video the first frame is taken. The picture comes out upright and without an orientation
 // tag. A single frame is always an estimate frame.
-RunReport dehaze_picture(Reader& reader, const Options& options, Console& console);
+Outcome dehaze_picture(Reader& reader, const Options& options, Console& console);
 
 }  // namespace dehaze
 

@@ -21,7 +21,7 @@ namespace {
 
 void note_what_is_lost(const Reader& reader, const FrameSize& size, OutputKind kind,
                        Console& console) {
-  if (kind != OutputKind::kY4m) {
+  if (!is_frames_only(kind)) {
     if (size.is_padded()) {
       console.note("H.264 needs an even size; the last column or row is repeated, giving " +
                    std::to_string(size.padded_width()) + " x " +
@@ -29,9 +29,10 @@ void note_what_is_lost(const Reader& reader, const FrameSize& size, OutputKind k
     }
     return;
   }
-  if (!reader.audio().empty()) console.note("Y4M holds no audio; it is left out");
+  const std::string name = kind == OutputKind::kY4m ? "Y4M holds" : "raw frames hold";
+  if (!reader.audio().empty()) console.note(name + " no audio; it is left out");
   if (!reader.has_constant_rate()) {
-    console.note("Y4M holds no time stamps; all frames become equally long");
+    console.note(name + " no time stamps; all frames become equally long");
   }
 }
 
@@ -44,7 +45,7 @@ Orientation turn_for(const Reader& reader, OutputKind kind) {
 VideoFormat format_before_turn(const Reader& reader, const AVFrame& first, const FramePath& path,
                                OutputKind kind) {
   const FrameSize& size = path.size();
-  const bool even_only = kind != OutputKind::kY4m;
+  const bool even_only = !is_frames_only(kind);
   VideoFormat format = video_format_like(first, path.siting());
   format.width = even_only ? size.padded_width() : size.visible_width;
   format.height = even_only ? size.padded_height() : size.visible_height;
@@ -64,7 +65,7 @@ VideoFormat turned(VideoFormat format, const Orientation& turn) {
 
 }  // namespace
 
-RunReport dehaze_video(Reader& reader, const Options& options, Console& console) {
+Outcome dehaze_video(Reader& reader, const Options& options, Console& console) {
   const OutputKind kind = options.output_kind;
   const FramePtr input = make_frame();
   if (!reader.read_frame(input.get())) throw Error(reader.path() + ": holds no video");
@@ -72,22 +73,24 @@ RunReport dehaze_video(Reader& reader, const Options& options, Console& console)
   FramePath path(*input, false, frames_per_second(reader), options.engine, console);
   note_what_is_lost(reader, path.size(), kind, console);
   const Orientation turn = turn_for(reader, kind);
-  const VideoFormat format = format_before_turn(reader, *input, path, kind);
+  VideoFormat format = format_before_turn(reader, *input, path, kind);
+  format.raw_layout = options.raw_output;
   FromNv21 from_nv21(format.width, format.height, path.siting(), format.samples);
   std::optional<FilterPipe> turner;
 
   std::optional<OutputFile> file;
   if (options.output != "-") file.emplace(options.output, options.force);
+  const VideoFormat output_format = turned(format, turn);
   // Declared after the file, so that it is closed before the file is removed.
-  VideoWriter writer(kind, file ? file->temporary_path() : options.output, reader,
-                     turned(format, turn));
+  VideoWriter writer(kind, file ? file->temporary_path() : options.output, reader, output_format);
 
   const int64_t limit =
       options.max_frames > 0 ? options.max_frames : std::numeric_limits<int64_t>::max();
   const int64_t expected = reader.frame_count();
-  Progress progress(console, expected > 0 || options.max_frames > 0
-                                 ? std::min(limit, expected > 0 ? expected : limit)
-                                 : 0);
+  Progress progress(console, "frames",
+                    expected > 0 || options.max_frames > 0
+                        ? std::min(limit, expected > 0 ? expected : limit)
+                        : 0);
   int64_t frames = 0;
   do {
     FramePtr output = from_nv21.convert(path.run(*input));
@@ -103,12 +106,12 @@ RunReport dehaze_video(Reader& reader, const Options& options, Console& console)
   int64_t audio_end = std::numeric_limits<int64_t>::max();
   if (frames == limit) {
     audio_end = writer.end();
-    if (kind != OutputKind::kY4m) reader.read_audio_until(audio_end);
+    if (!is_frames_only(kind)) reader.read_audio_until(audio_end);
   }
   writer.finish(reader.pending_audio(), audio_end);
   throw_if_interrupted();
   if (file) file->commit();
-  return path.engine().report();
+  return {path.engine().report(), output_format.width, output_format.height, frames};
 }
 
 }  // namespace dehaze

@@ -3,13 +3,13 @@
 #define TOOLS_DEHAZE_VIDEO_H
 
 #include "console.h"
-#include "engine.h"
 #include "media/reader.h"
 #include "options.h"
+#include "outcome.h"
 
 namespace dehaze {
 
-RunReport dehaze_video(Reader& reader, const Options& options, Console& console);
+Outcome dehaze_video(Reader& reader, const Options& options, Console& console);
 
 }  // namespace dehaze
 

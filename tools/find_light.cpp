@@ -8,7 +8,7 @@
 
 namespace dehaze {
 
-RunReport find_light(Reader& reader, const Options& options, Console& console) {
+Outcome find_light(Reader& reader, const Options& options, Console& console) {
   const FramePtr frame = make_frame();
   if (!reader.read_frame(frame.get())) throw Error(reader.path() + ": holds no picture");
   const double rate = reader.is_picture() ? 0 : frames_per_second(reader);
@@ -19,7 +19,7 @@ RunReport find_light(Reader& reader, const Options& options, Console& console) {
   do {
     path.run(*frame);
   } while (++frames < limit && !reader.is_picture() && reader.read_frame(frame.get()));
-  return path.engine().report();
+  return {path.engine().report(), path.size().visible_width, path.size().visible_height, frames};
 }
 
 }  // namespace dehaze

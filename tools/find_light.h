@@ -3,14 +3,14 @@
 #define TOOLS_FIND_LIGHT_H
 
 #include "console.h"
-#include "engine.h"
 #include "media/reader.h"
 #include "options.h"
+#include "outcome.h"
 
 namespace dehaze {
 
 // Of a video the first second is looked at, or --max-frames.
-RunReport find_light(Reader& reader, const Options& options, Console& console);
+Outcome find_light(Reader& reader, const Options& options, Console& console);
 
 }  // namespace dehaze
 

@@ -5,33 +5,39 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "engine_options.h"
+#include "output_kind.h"
+#include "raw_format.h"
 
 namespace dehaze {
 
-enum class OutputKind { kJpeg, kPng, kWebp, kMp4, kMov, kMkv, kY4m };
-
-inline bool is_picture_kind(OutputKind kind) {
-  return kind == OutputKind::kJpeg || kind == OutputKind::kPng || kind == OutputKind::kWebp;
-}
-
 struct Options {
-  std::string input;   // "-": Y4M on standard input
-  std::string output;  // "-": Y4M on standard output; empty: only the light is printed
+  // One file: input and output. Several or a folder: sources and output_folder.
+  std::string input;   // "-": standard input
+  std::string output;  // "-": standard output; empty: only the light is printed
   OutputKind output_kind = OutputKind::kY4m;
+  std::vector<std::string> sources;
+  std::string output_folder;
+
   EngineOptions engine;
-  int64_t max_frames = 0;  // 0: all
+  int64_t max_frames = 0;              // 0: all
+  std::optional<RawFormat> raw_input;  // none: the content tells
+  RawLayout raw_output = RawLayout::kI420;
+  int jobs = 1;  // files at a time
+  bool recurse = true;
   bool quiet = false;
   bool force = false;
   bool timing = false;
+  bool json = false;
+
+  bool is_batch() const { return !output_folder.empty(); }
+  bool is_light_only() const { return !is_batch() && output.empty(); }
 };
 
-// Kind by file extension, whatever its case; "-" is Y4M. Throws UsageError for any other.
-OutputKind output_kind_of(const std::string& path);
-
 // Empty if the text asked for (help, version) has been printed and there is nothing to do. Throws
-// UsageError.
+// UsageError; an Error if a folder is in the way.
 std::optional<Options> parse_options(int argc, char** argv);
 
 }  // namespace dehaze

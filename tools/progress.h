@@ -1,4 +1,4 @@
-// Progress of a video: frames, share done, speed and time left.
+// Progress of a file: frames or steps, share done, speed and time left.
 #ifndef TOOLS_PROGRESS_H
 #define TOOLS_PROGRESS_H
 
@@ -12,24 +12,28 @@ namespace dehaze {
 
 class Progress {
  public:
-  // total_frames: 0 if unknown, as for a pipe.
-  Progress(Console& console, int64_t total_frames);
+  // unit: "frames". total: 0 if unknown, as for a pipe.
+  Progress(Console& console, std::string unit, int64_t total);
 
-  // To be called once per finished frame; refreshes the line a few times a second.
+  // To be called once per finished unit; refreshes the line a few times a second.
   void advance();
 
  private:
   using Clock = std::chrono::steady_clock;
 
   Console& console_;
-  int64_t total_frames_;
-  int64_t frames_ = 0;
+  std::string unit_;
+  int64_t total_;
+  int64_t done_ = 0;
   Clock::time_point start_;
   Clock::time_point last_shown_;
 };
 
 // "120/300 frames, 40 %, 58.3 frames/s, 0:03 left"; without a total "120 frames, 58.3 frames/s".
-std::string progress_text(int64_t frames, int64_t total_frames, double seconds);
+std::string progress_text(const std::string& unit, int64_t done, int64_t total, double seconds);
+
+// "0:03", "1:02:03"
+std::string duration_text(int64_t seconds);
 
 }  // namespace dehaze
 

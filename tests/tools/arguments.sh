@@ -14,7 +14,7 @@ case_wrong_usage() {
   make_picture in.png 160x160
   dehaze_fails 2 'INPUT is required'
   dehaze_fails 2 'OUTPUT is required' in.png
-  dehaze_fails 2 'not expected' in.png out.png third.png
+  dehaze_fails 2 '3 names: several inputs need -o' in.png out.png third.png
   dehaze_fails 2 'not expected' --bogus in.png out.png
   dehaze_fails 2 'not in range' --level high in.png out.png
   dehaze_fails 2 'not in range' --level 256 in.png out.png

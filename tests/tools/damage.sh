@@ -11,7 +11,7 @@ case_not_a_picture() {
   seq 1000 >text.jpg
   head -c 5000 /dev/urandom >noise.mp4
   dehaze_fails 1 'missing.jpg: No such file' missing.jpg out.png
-  dehaze_fails 1 'is a folder' . out.png
+  dehaze_fails 2 'out.png: looks like the name of a file; . is a folder' . out.png
   dehaze_fails 1 'the file is empty' empty.jpg out.png
   dehaze_fails 1 'text.jpg: not a picture or video' text.jpg out.png
   dehaze_fails 1 'noise.mp4: ' noise.mp4 out.png

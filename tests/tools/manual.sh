@@ -37,6 +37,7 @@ case_completion() {
   done
   equal "$(completed --lev)" --level
   equal "$(completed --level '')" ""
+  equal "$(completed --engine p | tr '\n' ' ')" "photo preview "
   equal "$(completed in.png)" ""
 }
 

@@ -214,6 +214,20 @@ case_transparency() {
   same_picture out.jpg want.jpg
 }
 
+# JPEG is full range, whatever its chroma looks like.
+case_every_subsampling_of_jpeg() {
+  make_picture sharp.png 320x240
+  make_input -i sharp.png -vf gblur=6 in.png
+  dehaze in.png want.png
+  local format
+  for format in yuvj420p yuvj422p yuvj444p; do
+    make_input -i in.png -vf "zscale=m=170m:r=full:f=spline36,format=$format" -q:v 2 in.jpg
+    equal "$(stream in.jpg v pix_fmt)" $format
+    dehaze --force in.jpg out.png
+    close_pictures out.png want.png 34
+  done
+}
+
 case_sixteen_bit() {
   make_picture in16.png 320x240 rgb48be
   make_picture in8.png 320x240 rgb24

@@ -148,6 +148,21 @@ case_colors_mean_the_same() {
   done
 }
 
+# Full range is full range in every format, also those that are converted on the way.
+case_full_range_of_other_formats() {
+  make_picture sharp.png 320x240
+  make_input -i sharp.png -vf gblur=6 in.png
+  dehaze --level 10 in.png want.png
+  local format
+  for format in yuv440p yuv422p yuva420p yuv420p10le; do
+    make_input -i in.png -frames:v 1 -c:v ffv1 -color_range pc -colorspace smpte170m \
+      -vf "zscale=m=170m:r=full:f=spline36,format=yuv444p,scale=in_range=full:out_range=full,format=$format" in.mkv
+    equal "$(stream in.mkv v pix_fmt,color_range)" $format,pc
+    dehaze --force --level 10 in.mkv out.png
+    close_pictures out.png want.png 34
+  done
+}
+
 case_rgb_video() {
   make_input -f lavfi -i "$(source_video 320x240 0.2)" -vf "$kHaze,gblur=4,format=bgr0" -c:v ffv1 in.mkv
   make_input -i in.mkv -frames:v 1 -vf format=rgb24 in.png

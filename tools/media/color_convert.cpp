@@ -64,6 +64,33 @@ bool is_alike(const AVFrame& a, const AVFrame& b) {
          a.chroma_location == b.chroma_location;
 }
 
+AVPixelFormat without_range(AVPixelFormat format) {
+  switch (format) {
+    case AV_PIX_FMT_YUVJ411P:
+      return AV_PIX_FMT_YUV411P;
+    case AV_PIX_FMT_YUVJ420P:
+      return AV_PIX_FMT_YUV420P;
+    case AV_PIX_FMT_YUVJ422P:
+      return AV_PIX_FMT_YUV422P;
+    case AV_PIX_FMT_YUVJ440P:
+      return AV_PIX_FMT_YUV440P;
+    case AV_PIX_FMT_YUVJ444P:
+      return AV_PIX_FMT_YUV444P;
+    default:
+      return format;
+  }
+}
+
+// The same samples, nothing said about their range. The scaler that a graph puts in where zscale
+// does not know a format would squeeze full range into limited range; zscale is told the range.
+FramePtr without_range(const AVFrame& frame) {
+  FramePtr plain = make_frame();
+  check(av_frame_ref(plain.get(), &frame), "cannot allocate a frame");
+  plain->format = without_range(static_cast<AVPixelFormat>(frame.format));
+  plain->color_range = AVCOL_RANGE_UNSPECIFIED;
+  return plain;
+}
+
 // The same format without its alpha channel. zimg would weight the colours by it.
 std::string opaque_format(const AVPixFmtDescriptor& format, int bits) {
   if (format.nb_components < 3) return bits > 8 ? "gray16" : "gray";
@@ -102,10 +129,14 @@ bool ToNv21::convert(const AVFrame& frame, Nv21Frame& nv21) {
   const bool has_changed = is_first || !is_alike(frame, *like_);
   if (has_changed) {
     like_ = without_pixels(frame);
-    const std::string filter = plain_format_filter(static_cast<AVPixelFormat>(frame.format));
-    plain_pipe_ = filter.empty() ? nullptr : std::make_unique<FilterPipe>(frame, filter);
+    meaning_ = meaning_of(frame, is_picture_);
   }
-  const FramePtr padded = pad_to_even(plain_pipe_ ? *plain_pipe_->run(frame) : frame);
+  const FramePtr plain = without_range(frame);
+  if (has_changed) {
+    const std::string filter = plain_format_filter(static_cast<AVPixelFormat>(plain->format));
+    plain_pipe_ = filter.empty() ? nullptr : std::make_unique<FilterPipe>(*plain, filter);
+  }
+  const FramePtr padded = pad_to_even(plain_pipe_ ? *plain_pipe_->run(*plain) : *plain);
   if (has_changed) rebuild(*padded);
   if (pipe_) {
     pack_nv21(*pipe_->run(*padded), nv21);
@@ -117,22 +148,21 @@ bool ToNv21::convert(const AVFrame& frame, Nv21Frame& nv21) {
 
 void ToNv21::rebuild(const AVFrame& frame) {
   const AVPixelFormat format = static_cast<AVPixelFormat>(frame.format);
-  const SampleMeaning from = meaning_of(frame, is_picture_);
   const int width = size_.padded_width();
   const int height = size_.padded_height();
   const bool same_size = frame.width == width && frame.height == height;
   pipe_.reset();
-  if (same_size && from.is_library_color() && from.siting == siting_ &&
-      (format == AV_PIX_FMT_YUV420P || format == AV_PIX_FMT_YUVJ420P)) {
+  if (same_size && meaning_.is_library_color() && meaning_.siting == siting_ &&
+      format == AV_PIX_FMT_YUV420P) {
     return;
   }
   std::string more = ":width=" + std::to_string(width) + ":height=" + std::to_string(height);
-  more += resampling(same_size && is_420(format) && from.siting == siting_);
+  more += resampling(same_size && is_420(format) && meaning_.siting == siting_);
   // The haze removal raises contrast up to 2.5 times; without dithering that would show the steps
   // of 8 bits in smooth skies that the input had more bits for.
   if (bits_per_sample(format) > 8) more += ":dither=error_diffusion";
   pipe_ = std::make_unique<FilterPipe>(
-      frame, zscale(from, library_meaning(siting_), more) + ",format=yuv420p");
+      frame, zscale(meaning_, library_meaning(siting_), more) + ",format=yuv420p");
 }
 
 FromNv21::FromNv21(int visible_width, int visible_height, AVChromaLocation siting,

@@ -29,8 +29,9 @@ class ToNv21 {
 
   FrameSize size_;
   bool is_picture_;
-  AVChromaLocation siting_;  // of the NV21 frame
-  FramePtr like_;            // the frame that the pipes were built for, without its pixels
+  AVChromaLocation siting_;     // of the NV21 frame
+  FramePtr like_;               // the frame that the pipes were built for, without its pixels
+  SampleMeaning meaning_ = {};  // of its samples
   std::unique_ptr<FilterPipe> plain_pipe_;  // null: nothing to do before padding
   std::unique_ptr<FilterPipe> pipe_;        // null: copy
 };

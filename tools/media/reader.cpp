@@ -15,6 +15,7 @@ extern "C" {
 #include "errors.h"
 #include "interrupt.h"
 #include "media/av_error.h"
+#include "media/raw_frames.h"
 
 namespace dehaze {
 namespace {
@@ -54,7 +55,8 @@ bool declares_duration(const AVFormatContext& container) {
 
 }  // namespace
 
-Reader::Reader(const std::string& path) : path_(path == "-" ? "standard input" : path) {
+Reader::Reader(const std::string& path, const std::optional<RawFormat>& raw)
+    : path_(path == "-" ? "standard input" : path), raw_(raw) {
   if (path == "-") {
     open("pipe:0");
   } else {
@@ -64,6 +66,7 @@ Reader::Reader(const std::string& path) : path_(path == "-" ? "standard input" :
   }
   is_picture_ = is_picture_format(*container_->iformat);
   choose_streams();
+  if (raw_) set_raw_meaning(*raw_, *video_->codecpar);
   open_decoder();
 }
 
@@ -82,14 +85,17 @@ void Reader::open(const std::string& url) {
   options.set("protocol_whitelist", "none");
   // No name is passed, so that the content alone decides.
   const bool is_pipe = url == "pipe:0";
-  const AVInputFormat* format = is_pipe ? av_find_input_format("yuv4mpegpipe") : nullptr;
+  const char* const format_name = raw_ ? "rawvideo" : is_pipe ? "yuv4mpegpipe" : nullptr;
+  const AVInputFormat* format =
+      format_name != nullptr ? av_find_input_format(format_name) : nullptr;
+  if (raw_) set_raw_options(*raw_, options);
   const int result = avformat_open_input(&container, nullptr, format, options.address());
   container_.reset(container);  // null after a failure
-  if (result < 0 && is_pipe) {
+  if (result < 0 && is_pipe && !raw_) {
     throw_if_interrupted();
     throw Error(path_ +
                 ": not a YUV4MPEG2 stream; a pipe has to carry Y4M (ffmpeg -f "
-                "yuv4mpegpipe)");
+                "yuv4mpegpipe) or raw frames (--raw)");
   }
   check(result, path_ + ": not a picture or video that can be read");
   demuxer_errors_ = demuxer_errors_logged();
@@ -132,6 +138,7 @@ AVRational Reader::frame_rate() const {
 }
 
 bool Reader::has_constant_rate() const {
+  if (raw_) return true;
   const double average = av_q2d(video_->avg_frame_rate);
   const double rate = av_q2d(frame_rate());
   // An average over rounded time stamps is a little off.
@@ -253,6 +260,7 @@ bool Reader::read_frame(AVFrame* frame) {
       continue;
     }
     ++frames_;
+    if (raw_ && raw_->layout == RawLayout::kYv12) swap_chroma(*frame);
     frame->pts = frame->best_effort_timestamp;
     return true;
   }

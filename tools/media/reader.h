@@ -3,19 +3,21 @@
 #define TOOLS_MEDIA_READER_H
 
 #include <deque>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "errors.h"
 #include "media/ffmpeg_handles.h"
+#include "raw_format.h"
 
 namespace dehaze {
 
 class Reader {
  public:
-  // "-" reads Y4M from standard input. What the file is follows from its content, not its name.
-  // Throws Error if there is nothing to decode.
-  explicit Reader(const std::string& path);
+  // "-" reads Y4M from standard input. What the file is follows from its content, not its name,
+  // unless it is raw frames. Throws Error if there is nothing to decode.
+  explicit Reader(const std::string& path, const std::optional<RawFormat>& raw = std::nullopt);
 
   const std::string& path() const { return path_; }
   bool is_picture() const { return is_picture_; }
@@ -53,6 +55,7 @@ class Reader {
   Error damaged(const std::string& detail) const;
 
   std::string path_;
+  std::optional<RawFormat> raw_;
   bool is_picture_ = false;
   IoPtr io_;  // outlives the container that reads through it
   InputPtr container_;

@@ -6,7 +6,7 @@
 
 #include "media/color_convert.h"
 #include "media/ffmpeg_handles.h"
-#include "options.h"
+#include "output_kind.h"
 
 namespace dehaze {
 

@@ -2,6 +2,7 @@
 
 extern "C" {
 #include <libavutil/avutil.h>
+#include <libavutil/pixdesc.h>
 }
 
 #include <algorithm>
@@ -12,6 +13,7 @@ extern "C" {
 #include "media/av_error.h"
 #include "media/metadata.h"
 #include "media/orientation.h"
+#include "media/raw_frames.h"
 
 namespace dehaze {
 namespace {
@@ -32,8 +34,21 @@ const char* container_name(OutputKind kind) {
       return "matroska";
     case OutputKind::kY4m:
       return "yuv4mpegpipe";
+    case OutputKind::kRaw:
+      return "rawvideo";
     default:
       throw Error("internal error: not a kind of video");
+  }
+}
+
+const char* encoder_name(OutputKind kind) {
+  switch (kind) {
+    case OutputKind::kY4m:
+      return "wrapped_avframe";
+    case OutputKind::kRaw:
+      return "rawvideo";
+    default:
+      return "libx264";
   }
 }
 
@@ -79,13 +94,14 @@ bool stores_rotation(OutputKind kind) {
 
 VideoWriter::VideoWriter(OutputKind kind, const std::string& path, const Reader& reader,
                          const VideoFormat& format)
-    : is_y4m_(kind == OutputKind::kY4m),
+    : is_frames_only_(is_frames_only(kind)),
+      raw_layout_(format.raw_layout),
       has_constant_rate_(reader.has_constant_rate()),
       frame_rate_(reader.frame_rate()),
       input_base_(reader.video().time_base) {
   // Where no time stamps can be written, the average keeps the length of the video.
   const AVRational average = reader.video().avg_frame_rate;
-  if (is_y4m_ && !has_constant_rate_ && average.num > 0) frame_rate_ = average;
+  if (is_frames_only_ && !has_constant_rate_ && average.num > 0) frame_rate_ = average;
   if (frame_rate_.num <= 0 || frame_rate_.den <= 0) frame_rate_ = kUsualFrameRate;
   frame_length_ = std::max<int64_t>(av_rescale_q(1, av_inv_q(frame_rate_), input_base_), 1);
   const int64_t start = reader.container().start_time;
@@ -96,16 +112,16 @@ VideoWriter::VideoWriter(OutputKind kind, const std::string& path, const Reader&
   check(avformat_alloc_output_context2(&container, nullptr, container_name(kind), url.c_str()),
         "cannot set up the output");
   container_.reset(container);
-  open_encoder(format);
+  open_encoder(format, kind);
   add_video_stream(reader);
   if (stores_rotation(kind)) copy_display_matrix(reader.video(), video_);
-  if (!is_y4m_) add_audio_streams(reader);
+  if (!is_frames_only_) add_audio_streams(reader);
   copy_container_metadata(reader.container(), *container_);
   open_file(url);
 }
 
-void VideoWriter::open_encoder(const VideoFormat& format) {
-  const char* const name = is_y4m_ ? "wrapped_avframe" : "libx264";
+void VideoWriter::open_encoder(const VideoFormat& format, OutputKind kind) {
+  const char* const name = encoder_name(kind);
   const AVCodec* codec = avcodec_find_encoder_by_name(name);
   if (codec == nullptr) {
     throw Error(std::string("FFmpeg was built without the encoder ") + name);
@@ -114,7 +130,8 @@ void VideoWriter::open_encoder(const VideoFormat& format) {
   if (!encoder_) throw std::bad_alloc();
   encoder_->width = format.width;
   encoder_->height = format.height;
-  encoder_->pix_fmt = format.samples.format;
+  encoder_->pix_fmt =
+      kind == OutputKind::kRaw ? pixel_format_of(format.raw_layout) : format.samples.format;
   encoder_->color_range = format.range;
   encoder_->colorspace = format.matrix;
   encoder_->color_primaries = format.primaries;
@@ -122,13 +139,13 @@ void VideoWriter::open_encoder(const VideoFormat& format) {
   encoder_->chroma_sample_location = format.samples.meaning.siting;
   encoder_->sample_aspect_ratio = format.sample_aspect_ratio;
   encoder_->framerate = frame_rate_;
-  encoder_->time_base = is_y4m_ ? av_inv_q(frame_rate_) : input_base_;
+  encoder_->time_base = is_frames_only_ ? av_inv_q(frame_rate_) : input_base_;
   encoder_->field_order = AV_FIELD_PROGRESSIVE;
   if (container_->oformat->flags & AVFMT_GLOBALHEADER) {
     encoder_->flags |= AV_CODEC_FLAG_GLOBAL_HEADER;
   }
   Dictionary options;
-  if (!is_y4m_) {
+  if (!is_frames_only_) {
     options.set("crf", kQuality);
     options.set("preset", kSpeed);
     // Writes the frame rate into the stream instead of the tick of the time stamps. The time stamps
@@ -146,8 +163,8 @@ void VideoWriter::add_video_stream(const Reader& reader) {
         "cannot set up the output");
   video_->time_base = encoder_->time_base;
   video_->sample_aspect_ratio = encoder_->sample_aspect_ratio;
-  video_->avg_frame_rate = is_y4m_ ? frame_rate_ : reader.video().avg_frame_rate;
-  video_->r_frame_rate = is_y4m_ ? frame_rate_ : reader.video().r_frame_rate;
+  video_->avg_frame_rate = is_frames_only_ ? frame_rate_ : reader.video().avg_frame_rate;
+  video_->r_frame_rate = is_frames_only_ ? frame_rate_ : reader.video().r_frame_rate;
   video_->disposition = reader.video().disposition;
   copy_stream_metadata(reader.video(), *video_);
 }
@@ -200,7 +217,7 @@ void VideoWriter::write(AVFrame& frame, int64_t duration, std::deque<PacketPtr>&
   const int64_t before = last_pts_;
   const int64_t pts = place_in_time(frame.pts, duration);
   write_audio_before(av_rescale_q(pts, input_base_, AV_TIME_BASE_Q), audio);
-  if (is_y4m_) {
+  if (is_frames_only_) {
     frame.pts = frames_;
   } else {
     const int64_t shift = av_rescale_q(start_, AV_TIME_BASE_Q, input_base_);
@@ -210,7 +227,27 @@ void VideoWriter::write(AVFrame& frame, int64_t duration, std::deque<PacketPtr>&
   }
   ++frames_;
   frame.pict_type = AV_PICTURE_TYPE_NONE;
-  encode(&frame);
+  if (encoder_->codec_id == AV_CODEC_ID_RAWVIDEO) {
+    encode(in_raw_layout(frame).get());
+  } else {
+    encode(&frame);
+  }
+}
+
+FramePtr VideoWriter::in_raw_layout(const AVFrame& frame) {
+  FramePtr raw = make_frame();
+  check(av_frame_ref(raw.get(), &frame), "cannot allocate a frame");
+  if (frame.format != encoder_->pix_fmt) {
+    if (!raw_pipe_) {
+      raw_pipe_.emplace(frame, std::string("format=") + av_get_pix_fmt_name(encoder_->pix_fmt));
+    }
+    // Only the order of the chroma bytes changes: the scaler must not make it limited range.
+    raw->color_range = AVCOL_RANGE_UNSPECIFIED;
+    raw = raw_pipe_->run(*raw);
+    raw->pts = frame.pts;
+  }
+  if (raw_layout_ == RawLayout::kYv12) swap_chroma(*raw);
+  return raw;
 }
 
 int64_t VideoWriter::end() const {
@@ -224,7 +261,7 @@ void VideoWriter::encode(const AVFrame* frame) {
     const int result = avcodec_receive_packet(encoder_.get(), packet_.get());
     if (result == AVERROR(EAGAIN) || result == AVERROR_EOF) return;
     check(result, "cannot encode a frame");
-    if (is_y4m_) {
+    if (is_frames_only_) {
       packet_->duration = 1;
     } else if (const auto known = durations_.find(packet_->pts); known != durations_.end()) {
       packet_->duration = known->second;

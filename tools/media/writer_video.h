@@ -1,16 +1,19 @@
-// Output: H.264 in MP4, MOV or MKV with copied audio, or Y4M as a file or on a pipe.
+// Output: H.264 in MP4, MOV or MKV with copied audio; Y4M or raw frames as a file or on a pipe.
 #ifndef TOOLS_MEDIA_WRITER_VIDEO_H
 #define TOOLS_MEDIA_WRITER_VIDEO_H
 
 #include <cstdint>
 #include <deque>
 #include <map>
+#include <optional>
 #include <string>
 
 #include "media/color_convert.h"
 #include "media/ffmpeg_handles.h"
+#include "media/filter_pipe.h"
 #include "media/reader.h"
-#include "options.h"
+#include "output_kind.h"
+#include "raw_format.h"
 
 namespace dehaze {
 
@@ -24,6 +27,7 @@ struct VideoFormat {
   AVColorPrimaries primaries;
   AVColorTransferCharacteristic transfer;
   AVRational sample_aspect_ratio;  // 0/1 if unknown
+  RawLayout raw_layout;            // of raw frames
 };
 
 // 4:2:0 in the range, matrix and tags of the input. The size and aspect ratio are the caller's.
@@ -51,11 +55,12 @@ class VideoWriter {
   void finish(std::deque<PacketPtr>& audio, int64_t audio_end);
 
  private:
-  void open_encoder(const VideoFormat& format);
+  void open_encoder(const VideoFormat& format, OutputKind kind);
   void add_video_stream(const Reader& reader);
   void add_audio_streams(const Reader& reader);
   void open_file(const std::string& path);
   int64_t place_in_time(int64_t pts, int64_t duration);
+  FramePtr in_raw_layout(const AVFrame& frame);
   void encode(const AVFrame* frame);
   void write_packet(AVPacket& packet);
   void write_audio_before(int64_t end, std::deque<PacketPtr>& audio);
@@ -65,7 +70,9 @@ class VideoWriter {
     AVStream* output;
   };
 
-  bool is_y4m_;
+  bool is_frames_only_;
+  RawLayout raw_layout_;
+  std::optional<FilterPipe> raw_pipe_;  // to the raw layout; none if nothing is to be done
   bool has_constant_rate_;
   OutputPtr container_;
   EncoderPtr encoder_;
