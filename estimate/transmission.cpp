@@ -53,10 +53,7 @@ void* CalTThreadPreview(void* arg) {
   const uint8_t* const mean = gCalTSrcPreview[code.slot] + range.begin;
   const uint8_t* const minimum = gCalTSrc1Preview[code.slot] + range.begin;
   uint8_t* const codes = gCalTDstPreview[code.slot] + range.begin;
-  const int strength_q8 = gAlpha[code.slot];
-  const int light = gAA[code.slot];
-  for (size_t i = 0; i < range.count; ++i)
-    codes[i] = haze::estimate::code_q8(strength_q8, light, mean[i], minimum[i]);
+  haze::estimate::codes_q8(mean, minimum, codes, range.count, gAlpha[code.slot], gAA[code.slot]);
   return nullptr;
 }
 

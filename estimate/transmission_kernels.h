@@ -68,26 +68,40 @@ inline void group_codes_portable(const uint8_t* mean, const uint8_t* minimum, ui
   }
 }
 
-// The codes of every mean and of every minimum, each as if it were the lesser of the two. With
-// monotone arguments a pixel's code is the larger of its two entries: the code of a minimum of two
-// values is the maximum of their codes.
+// The codes of every mean and of every minimum, each as if it were the lesser of the two. Where a
+// code can only fall when that minimum rises, a pixel's code is the larger of its two entries: the
+// code of a minimum of two values is the maximum of their codes.
 struct CodeTables {
+  static constexpr size_t kPixelsWorthIt = 4096;
+
   uint8_t of_mean[256];
   uint8_t of_minimum[256];
-
-  explicit CodeTables(GroupArguments arguments) {
-    for (int value = 0; value < 256; ++value) {
-      const float sample = static_cast<float>(value);
-      of_mean[value] = group_code(sample * arguments.strength, arguments.minus_inv_a);
-      of_minimum[value] = group_code(sample, arguments.minus_inv_a);
-    }
-  }
 };
 
-inline void look_up_codes_portable(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes,
-                                   size_t begin, size_t end, const CodeTables& tables) {
-  for (size_t i = begin; i < end; ++i)
-    codes[i] = max(tables.of_mean[mean[i]], tables.of_minimum[minimum[i]]);
+inline CodeTables group_code_tables(GroupArguments arguments) {
+  CodeTables tables;
+  for (int value = 0; value < 256; ++value) {
+    const float sample = static_cast<float>(value);
+    tables.of_mean[value] = group_code(sample * arguments.strength, arguments.minus_inv_a);
+    tables.of_minimum[value] = group_code(sample, arguments.minus_inv_a);
+  }
+  return tables;
+}
+
+#if HAZE_X86
+// The first codes from tables; returns the first pixel that it did not write.
+size_t look_up_codes_avx512(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
+                            const uint8_t* of_mean, const uint8_t* of_minimum);
+#endif
+
+inline void look_up_codes(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
+                          const CodeTables& tables) {
+  size_t i = 0;
+#if HAZE_X86
+  if (cpu_level() == CpuLevel::kAvx512)
+    i = look_up_codes_avx512(mean, minimum, codes, end, tables.of_mean, tables.of_minimum);
+#endif
+  for (; i < end; ++i) codes[i] = max(tables.of_mean[mean[i]], tables.of_minimum[minimum[i]]);
 }
 
 #if HAZE_NEON
@@ -179,12 +193,10 @@ inline size_t group_codes_neon(const uint8_t* mean, const uint8_t* minimum, uint
 #endif
 
 #if HAZE_X86
-// Same bytes with the pixels' own minima; each returns the first pixel that it did not write.
-// Arithmetic is faster than lookups in a vector of 32 bytes, but not in one of 64.
+// Same bytes with the pixels' own minima; returns the first pixel that it did not write. In vectors
+// of 32 bytes arithmetic is faster than lookups.
 size_t group_codes_avx2(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
                         float strength, float minus_inv_a);
-size_t look_up_codes_avx512(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t end,
-                            const uint8_t* of_mean, const uint8_t* of_minimum);
 #endif
 
 // Codes of the first pixels with their own minima in a faster way, where there is one; returns how
@@ -195,15 +207,8 @@ inline size_t leading_codes(const uint8_t* mean, const uint8_t* minimum, uint8_t
   if (cpu_level() == CpuLevel::kAvx2)
     return group_codes_avx2(mean, minimum, codes, end, arguments.strength, arguments.minus_inv_a);
 #endif
-  constexpr size_t kPixelsWorthTables = 4096;
-  if (end < kPixelsWorthTables || !are_monotone(arguments)) return 0;
-  const CodeTables tables(arguments);
-  size_t done = 0;
-#if HAZE_X86
-  if (cpu_level() == CpuLevel::kAvx512)
-    done = look_up_codes_avx512(mean, minimum, codes, end, tables.of_mean, tables.of_minimum);
-#endif
-  look_up_codes_portable(mean, minimum, codes, done, end, tables);
+  if (end < CodeTables::kPixelsWorthIt || !are_monotone(arguments)) return 0;
+  look_up_codes(mean, minimum, codes, end, group_code_tables(arguments));
   return end;
 }
 
@@ -240,18 +245,36 @@ inline void tail_codes(const uint8_t* mean, const uint8_t* minimum, uint8_t* cod
   }
 }
 
+// The code of `least`, the lesser of the mean's and the minimum's term in units of 1 / 256.
+//
 // Range: |t| may be anything, infinite or not a number; only 0.4 <= t <= 0.99 is converted.
-inline uint8_t code_q8(int strength_q8, int light, uint8_t mean, uint8_t minimum) {
-  // A product past 32 bits wraps.
-  const int32_t scaled =
-      static_cast<int32_t>(static_cast<uint32_t>(strength_q8) * static_cast<uint32_t>(mean));
-  const int32_t bound = 256 * minimum;
-  const float least = static_cast<float>(bound < scaled ? bound : scaled);
-  const float t = (256.0f - least / static_cast<float>(light)) * 0.00390625f;
+inline uint8_t code_q8(int32_t least, int light) {
+  const float t = (256.0f - static_cast<float>(least) / static_cast<float>(light)) * 0.00390625f;
   if (static_cast<double>(t) < 0.4) return kLeastCode;
   if (static_cast<double>(t) > 0.99) return kMostCode;
   if (t != t) return 0;
   return static_cast<uint8_t>(-kCodeOffset + t * kCodeScale);
+}
+
+// A product past 32 bits wraps.
+inline int32_t scaled_q8(int strength_q8, int mean) {
+  return static_cast<int32_t>(static_cast<uint32_t>(strength_q8) * static_cast<uint32_t>(mean));
+}
+
+// Codes by whole numbers: t = (256 - min(strength * mean, 256 * minimum) / light) / 256.
+inline void codes_q8(const uint8_t* mean, const uint8_t* minimum, uint8_t* codes, size_t count,
+                     int strength_q8, int light) {
+  if (light > 0 && count >= CodeTables::kPixelsWorthIt) {
+    CodeTables tables;
+    for (int value = 0; value < 256; ++value) {
+      tables.of_mean[value] = code_q8(scaled_q8(strength_q8, value), light);
+      tables.of_minimum[value] = code_q8(256 * value, light);
+    }
+    look_up_codes(mean, minimum, codes, count, tables);
+    return;
+  }
+  for (size_t i = 0; i < count; ++i)
+    codes[i] = code_q8(min(256 * minimum[i], scaled_q8(strength_q8, mean[i])), light);
 }
 
 }  // namespace haze::estimate
