@@ -4,6 +4,7 @@
 
 #include <initializer_list>
 
+#include "core/image_size.h"
 #include "haze_preview.h"
 #include "recover/frame_recovery_kernels.h"
 
@@ -45,7 +46,7 @@ void recover_blocks(BlockRow row, const float* t, int begin, int end, LightAncho
 
 void HazeRemoving3Preview_NV21_f(unsigned char* frame, float* transmission, unsigned char* light,
                                  int width, int height, int /*recoverArg*/) {
-  if (width < 2 || height < 2) return;
+  if (!haze::has_blocks(width, height)) return;
   const LightAnchor anchor = haze::recover::light_anchor(light);
   const int blocks = width / 2;
   uint8_t* const chroma = frame + static_cast<ptrdiff_t>(width) * height;

@@ -1,4 +1,5 @@
 #include "recover/frame_recovery.h"
+#include "core/image_size.h"
 
 #include <stddef.h>
 
@@ -152,7 +153,7 @@ namespace {
 
 void recover_packed(uint8_t* frame, const uint8_t* transmission, const uint8_t* light_bgr,
                     int width, int height, haze::recover::ChromaLayout layout) {
-  if (width < 2 || height < 2) return;
+  if (!haze::has_blocks(width, height)) return;
   haze::recover::recover_frame(frame, {transmission, width / 2}, width, height, layout,
                                haze::recover::light_anchor(light_bgr), nullptr);
 }

@@ -1,4 +1,5 @@
 // Recovery of planar frames, whole or in stripes, from float transmissions through reciprocals.
+#include "core/image_size.h"
 #include "core/stripes.h"
 #include "haze_preview.h"
 #include "recover/block_recovery.h"
@@ -14,6 +15,7 @@ int gHRHWPreview;
 
 namespace {
 
+using haze::has_blocks;
 using haze::recover::FloatRecovery;
 using haze::recover::IntegerRecovery;
 using haze::recover::light_anchor;
@@ -22,8 +24,6 @@ using haze::recover::recover_anchors;
 using haze::recover::recover_every_pixel;
 
 constexpr int kStripes = 4;
-
-bool has_blocks(int width, int height) { return width >= 2 && height >= 2; }
 
 }  // namespace
 

@@ -1,6 +1,7 @@
 // Recovery of packed frames of two bytes a pixel, Y0 Cr Y1 Cb, into another buffer.
 #include <stddef.h>
 
+#include "core/image_size.h"
 #include "core/numeric.h"
 #include "haze_preview.h"
 #include "recover/block_indices.h"
@@ -36,6 +37,7 @@ void recover_row_pair(const uint8_t* src, uint8_t* dst, ptrdiff_t row_bytes, int
 
 void HazeRemovingPreview(unsigned char* src, float* t, unsigned char* A, unsigned char* dst, int w,
                          int h) {
+  if (!haze::has_blocks(w, h)) return;
   const int columns = w / 2;
   const int rows = h / 2;
   const ptrdiff_t row_bytes = 2 * static_cast<ptrdiff_t>(w);

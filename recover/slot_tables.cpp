@@ -1,6 +1,7 @@
 // Recovery of NV21 frames through global tables, one set per slot, by eight threads.
 #include <stdint.h>
 
+#include "core/image_size.h"
 #include "core/shared_int.h"
 #include "core/stripes.h"
 #include "haze_preview.h"
@@ -61,13 +62,15 @@ void recover_row(uint8_t* top, uint8_t* bottom, uint8_t* vu, const uint8_t* code
 void* CalRemoveThreadPreview(void* arg) {
   const haze::StripeCode code = haze::decode_stripe(arg);
   if (!haze::is_stripe(code, kThreads)) return nullptr;
-  const ptrdiff_t width = haze::load_shared(gCalRemoveWPreview);
-  const ptrdiff_t height = haze::load_shared(gCalRemoveHPreview);
-  const int blocks = static_cast<int>(width / 2);
+  const int columns = haze::load_shared(gCalRemoveWPreview);
+  const int luma_rows = haze::load_shared(gCalRemoveHPreview);
+  if (!haze::has_blocks(columns, luma_rows)) return nullptr;
+  const ptrdiff_t width = columns;
+  const ptrdiff_t height = luma_rows;
+  const int blocks = columns / 2;
   uint8_t* const frame = gCalRemoveSrcPreview[code.slot];
   const uint8_t* const codes = gCalRemoveScalePreview[code.slot];
-  const haze::StripeRange rows =
-      haze::even_stripe(static_cast<int>(height / 2), kThreads, code.stripe);
+  const haze::StripeRange rows = haze::even_stripe(luma_rows / 2, kThreads, code.stripe);
   for (ptrdiff_t y = rows.begin; y < rows.end; ++y) {
     uint8_t* const luma = frame + 2 * y * width;
     recover_row(luma, luma + width, frame + (height + y) * width, codes + y * blocks, blocks,

@@ -1,4 +1,5 @@
 // Half-resolution BGR of preview frames by eight threads, and float planes at twice their size.
+#include "core/image_size.h"
 #include "core/scratch.h"
 #include "core/shared_int.h"
 #include "core/stripes.h"
@@ -52,9 +53,7 @@ void convert_rows(int slot, haze::StripeRange rows) {
 
 // Odd sides would end in blocks whose chroma the frame does not have.
 bool has_frame() {
-  const int width = haze::load_shared(gZoomOutWPreview);
-  const int height = haze::load_shared(gZoomOutHPreview);
-  return width >= 1 && height >= 1 && width % 2 == 0 && height % 2 == 0;
+  return haze::has_blocks(haze::load_shared(gZoomOutWPreview), haze::load_shared(gZoomOutHPreview));
 }
 
 // Worker beside all others of its slot: as ZoomOutThreadPreview, but stripe 3 leaves the rows out

@@ -39,6 +39,13 @@ Size draw_empty_size(Choices& choices) {
   return choices.one_in(2) ? Size{empty, other} : Size{other, empty};
 }
 
+Size draw_size_without_blocks(Choices& choices) {
+  if (choices.one_in(2)) return draw_empty_size(choices);
+  const int odd = 2 * choices.between(0, 40) + 1;
+  const int other = choices.between(1, 40);
+  return choices.one_in(2) ? Size{odd, other} : Size{other, odd};
+}
+
 bool draws_nothing(Choices& choices) { return choices.one_in(12); }
 
 int draw_slot(Choices& choices, bool& is_slot) {

@@ -26,6 +26,9 @@ Size draw_even_size(Choices& choices);
 // One side or both are 0 or negative.
 Size draw_empty_size(Choices& choices);
 
+// One of those, or an odd side: no image of whole 2 x 2 blocks.
+Size draw_size_without_blocks(Choices& choices);
+
 // Now and then true: the call is to be one that does nothing.
 bool draws_nothing(Choices& choices);
 

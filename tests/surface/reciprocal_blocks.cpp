@@ -21,7 +21,7 @@ struct MappedFrame {
 MappedFrame draw_mapped_frame(Choices& choices, int rows) {
   MappedFrame drawn;
   const bool nothing = draws_nothing(choices);
-  drawn.size = nothing ? draw_empty_size(choices) : draw_even_size(choices);
+  drawn.size = nothing ? draw_size_without_blocks(choices) : draw_even_size(choices);
   for (int i = 0; i < 3; ++i) drawn.light.push_back(choices.byte());
   if (nothing) return drawn;
   const TransmissionMood mood = choices.one_of(kTransmissionMoods);

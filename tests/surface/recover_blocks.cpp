@@ -44,7 +44,7 @@ struct CodedFrame {
 CodedFrame draw_coded_frame(Choices& choices) {
   CodedFrame drawn;
   const bool nothing = draws_nothing(choices);
-  drawn.size = nothing ? draw_empty_size(choices) : draw_even_size(choices);
+  drawn.size = nothing ? draw_size_without_blocks(choices) : draw_even_size(choices);
   drawn.light = draw_light(choices);
   if (nothing) return drawn;
   drawn.frame = draw_frame(choices, drawn.size);
@@ -144,7 +144,7 @@ void draw_tables_worker(Choices& choices, Call& call) {
 
 void draw_recovery_by_division(Choices& choices, Call& call) {
   const bool nothing = draws_nothing(choices);
-  const Size size = nothing ? draw_empty_size(choices) : draw_even_size(choices);
+  const Size size = nothing ? draw_size_without_blocks(choices) : draw_even_size(choices);
   const Bytes light_bgr = draw_light(choices);
   Bytes content, want;
   Plane map;
@@ -184,8 +184,7 @@ ZoomedFrame draw_zoomed_frame(Choices& choices) {
   ZoomedFrame drawn;
   drawn.format = choices.one_in(2) ? kInputFormatPlanar : kInputFormatNv21;
   const bool nothing = draws_nothing(choices);
-  drawn.size = nothing ? draw_empty_size(choices) : draw_even_size(choices);
-  if (nothing && choices.one_in(2)) drawn.size = {2 * choices.between(1, 20) + 1, 40};
+  drawn.size = nothing ? draw_size_without_blocks(choices) : draw_even_size(choices);
   if (nothing) return drawn;
   drawn.frame = draw_frame(choices, drawn.size);
   drawn.fill.assign(3 * drawn.size.half().area(), 0x77);
