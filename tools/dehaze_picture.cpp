@@ -5,6 +5,7 @@
 #include "interrupt.h"
 #include "media/av_error.h"
 #include "media/color_convert.h"
+#include "media/exif.h"
 #include "media/filter_pipe.h"
 #include "media/orientation.h"
 #include "media/transparency.h"
@@ -19,14 +20,27 @@ Orientation orientation_of(const Reader& reader, const AVFrame& frame) {
   return matrix != nullptr ? orientation_of_matrix(matrix) : orientation_of_picture(frame);
 }
 
-void copy_icc_profile(const AVFrame& from, AVFrame* to, OutputKind kind, Console& console) {
+void copy_icc_profile(const AVFrame& from, AVFrame* to) {
   const AVFrameSideData* profile = av_frame_get_side_data(&from, AV_FRAME_DATA_ICC_PROFILE);
   if (profile == nullptr) return;
-  // The encoder leaves it out.
-  if (kind == OutputKind::kWebp) console.note("the colour profile is lost in WebP; PNG keeps it");
   AVFrameSideData* copy =
       av_frame_new_side_data_from_buf(to, profile->type, av_buffer_ref(profile->buf));
   if (copy == nullptr) throw std::bad_alloc();
+}
+
+Bytes exif_for(const Reader& reader, const AVFrame& picture, OutputKind kind, Console& console) {
+  if (!reader.is_picture()) return {};
+  Bytes exif = read_exif(reader.path());
+  if (exif.empty()) return {};
+  if (!make_exif_upright(exif, picture.width, picture.height)) {
+    console.note("the camera data (EXIF) is damaged; it is left out");
+    return {};
+  }
+  if (kind == OutputKind::kJpeg && exif.size() > kLargestJpegExif) {
+    console.note("the camera data (EXIF) is too long for JPEG; it is left out");
+    return {};
+  }
+  return exif;
 }
 
 }  // namespace
@@ -55,11 +69,12 @@ Outcome dehaze_picture(Reader& reader, const Options& options, Console& console)
     picture = with_alpha(*picture, *alpha);
   }
   if (!orientation.is_upright()) picture = run_filter(*picture, orientation.filter());
-  copy_icc_profile(*frame, picture.get(), options.output_kind, console);
+  copy_icc_profile(*frame, picture.get());
+  const Bytes exif = exif_for(reader, *picture, options.output_kind, console);
 
   throw_if_interrupted();
   OutputFile file(options.output, options.force);
-  write_picture(*picture, options.output_kind, file.temporary_path());
+  write_picture(*picture, options.output_kind, file.temporary_path(), exif);
   throw_if_interrupted();
   file.commit();
   return {path.engine().report(), picture->width, picture->height, 1};

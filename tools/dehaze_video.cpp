@@ -1,6 +1,7 @@
 #include "dehaze_video.h"
 
 #include <algorithm>
+#include <cmath>
 #include <limits>
 #include <optional>
 #include <string>
@@ -30,7 +31,9 @@ void note_what_is_lost(const Reader& reader, const FrameSize& size, OutputKind k
     return;
   }
   const std::string name = kind == OutputKind::kY4m ? "Y4M holds" : "raw frames hold";
-  if (!reader.audio().empty()) console.note(name + " no audio; it is left out");
+  if (!reader.companions().empty()) {
+    console.note(name + " no audio or subtitles; they are left out");
+  }
   if (!reader.has_constant_rate()) {
     console.note(name + " no time stamps; all frames become equally long");
   }
@@ -51,6 +54,12 @@ VideoFormat format_before_turn(const Reader& reader, const AVFrame& first, const
   format.height = even_only ? size.padded_height() : size.visible_height;
   format.sample_aspect_ratio = reader.sample_aspect_ratio(first);
   return format;
+}
+
+// Of so many frames, in AV_TIME_BASE units; INT64_MAX if there is no limit or it is unknown.
+int64_t length_of(int64_t frames, double frames_per_second) {
+  if (frames == 0 || frames_per_second <= 0) return std::numeric_limits<int64_t>::max();
+  return std::llround(static_cast<double>(frames) / frames_per_second * AV_TIME_BASE);
 }
 
 VideoFormat turned(VideoFormat format, const Orientation& turn) {
@@ -75,6 +84,7 @@ Outcome dehaze_video(Reader& reader, const Options& options, Console& console) {
   const Orientation turn = turn_for(reader, kind);
   VideoFormat format = format_before_turn(reader, *input, path, kind);
   format.raw_layout = options.raw_output;
+  format.longest = length_of(options.max_frames, frames_per_second(reader));
   FromNv21 from_nv21(format.width, format.height, path.siting(), format.samples);
   std::optional<FilterPipe> turner;
 
@@ -83,6 +93,7 @@ Outcome dehaze_video(Reader& reader, const Options& options, Console& console) {
   const VideoFormat output_format = turned(format, turn);
   // Declared after the file, so that it is closed before the file is removed.
   VideoWriter writer(kind, file ? file->temporary_path() : options.output, reader, output_format);
+  for (const std::string& text : writer.left_out()) console.note(text);
 
   const int64_t limit =
       options.max_frames > 0 ? options.max_frames : std::numeric_limits<int64_t>::max();
@@ -99,16 +110,16 @@ Outcome dehaze_video(Reader& reader, const Options& options, Console& console) {
       output = turner->run(*output);
     }
     output->pts = input->pts;
-    writer.write(*output, input->pkt_duration, reader.pending_audio());
+    writer.write(*output, input->pkt_duration, reader.pending());
     progress.advance();
   } while (++frames < limit && reader.read_frame(input.get()));
 
-  int64_t audio_end = std::numeric_limits<int64_t>::max();
+  int64_t last = std::numeric_limits<int64_t>::max();
   if (frames == limit) {
-    audio_end = writer.end();
-    if (!is_frames_only(kind)) reader.read_audio_until(audio_end);
+    last = writer.end();
+    if (!is_frames_only(kind)) reader.read_companions_until(last);
   }
-  writer.finish(reader.pending_audio(), audio_end);
+  writer.finish(reader.pending(), last);
   throw_if_interrupted();
   if (file) file->commit();
   return {path.engine().report(), output_format.width, output_format.height, frames};

@@ -238,52 +238,6 @@ case_sixteen_bit() {
   equal "$(stream out16.png v pix_fmt)" rgb24
 }
 
-# exif_jpeg IN OUT ORIENTATION: puts an EXIF segment with nothing but the orientation after the
-# start of the JPEG file.
-exif_jpeg() {
-  {
-    head -c 2 "$1"
-    printf '\xff\xe1\x00\x22Exif\0\0MM\0\x2a\0\0\0\x08\0\x01\x01\x12\0\x03\0\0\0\x01\0'
-    printf "\\x0$3\\0\\0\\0\\0\\0\\0"
-    tail -c +3 "$1"
-  } >"$2"
-}
-
-case_exif_orientation() {
-  make_picture plain.jpg 321x200 yuvj420p
-  dehaze plain.jpg upright.png
-  local turn
-  for turn in 1:null 2:hflip 3:hflip,vflip 4:vflip 5:transpose=0 6:transpose=clock \
-    7:transpose=3 8:transpose=cclock; do
-    exif_jpeg plain.jpg in.jpg "${turn%%:*}"
-    make_input -i upright.png -vf "${turn#*:}" want.png
-    dehaze --force in.jpg out.png
-    same_picture out.png want.png
-    dehaze --force in.jpg out.jpg
-    close_pictures out.jpg want.png 28
-    ! grep -aq Exif out.jpg || fail "an orientation tag in the upright output"
-  done
-}
-
-case_color_profile() {
-  make_picture plain.jpg 160x160 yuvj420p
-  # A segment that is a profile by its label; its content is carried, not read.
-  {
-    head -c 2 plain.jpg
-    printf '\xff\xe2\x00\x90ICC_PROFILE\0\x01\x01'
-    head -c 128 /dev/zero | tr '\0' 'p'
-    tail -c +3 plain.jpg
-  } >in.jpg
-  local kind
-  for kind in jpg png; do
-    dehaze in.jpg "out.$kind"
-    says_nothing
-    ffprobe -v error -show_frames "out.$kind" | holds 'ICC profile' || fail "no profile in $kind"
-  done
-  dehaze in.jpg out.webp
-  says 'colour profile is lost in WebP'
-}
-
 case_first_frame_of_a_video() {
   make_input -f lavfi -i "$(source_video 320x240 0.4)" -vf "$kHaze,format=yuv420p" in.y4m
   make_input -i in.y4m -frames:v 1 first.y4m

@@ -43,7 +43,7 @@ case_json_beside_a_pipe() {
   dehaze in.mp4 want.y4m
   cmp out.y4m want.y4m
   equal "$(wc -l <result)" 1 lines
-  equal "$(field result 0 'o["frames"], o["notes"]')" "(5, ['Y4M holds no audio; it is left out'])"
+  equal "$(field result 0 'o["frames"], o["notes"]')" "(5, ['Y4M holds no audio or subtitles; they are left out'])"
 }
 
 case_json_of_a_folder() {

@@ -1,8 +1,15 @@
 #include "media/metadata.h"
 
+extern "C" {
+#include <libavutil/avutil.h>
+#include <libavutil/mem.h>
+}
+
 #include <algorithm>
 #include <array>
 #include <string_view>
+
+#include "media/av_error.h"
 
 namespace dehaze {
 namespace {
@@ -38,6 +45,27 @@ void copy_container_metadata(const AVFormatContext& from, AVFormatContext& to) {
 
 void copy_stream_metadata(const AVStream& from, AVStream& to) {
   copy_metadata(from.metadata, &to.metadata);
+}
+
+void copy_chapters(const AVFormatContext& from, AVFormatContext& to, int64_t start,
+                   int64_t length) {
+  for (unsigned i = 0; i < from.nb_chapters; ++i) {
+    const AVChapter& chapter = *from.chapters[i];
+    const int64_t begin = av_rescale_q(chapter.start, chapter.time_base, AV_TIME_BASE_Q) - start;
+    const int64_t end = av_rescale_q(chapter.end, chapter.time_base, AV_TIME_BASE_Q) - start;
+    if (end <= 0 || begin >= length) continue;
+    AVChapter* copy = static_cast<AVChapter*>(av_mallocz(sizeof(AVChapter)));
+    if (copy == nullptr) throw std::bad_alloc();
+    copy->id = chapter.id;
+    copy->time_base = AV_TIME_BASE_Q;
+    copy->start = std::max<int64_t>(begin, 0);
+    copy->end = std::min(end, length);
+    copy_metadata(chapter.metadata, &copy->metadata);
+    // Owned, and freed, by the container.
+    int count = static_cast<int>(to.nb_chapters);
+    check(av_dynarray_add_nofree(&to.chapters, &count, copy), "cannot copy the chapters");
+    to.nb_chapters = static_cast<unsigned>(count);
+  }
 }
 
 }  // namespace dehaze

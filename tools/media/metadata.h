@@ -10,6 +10,10 @@ namespace dehaze {
 void copy_container_metadata(const AVFormatContext& from, AVFormatContext& to);
 void copy_stream_metadata(const AVStream& from, AVStream& to);
 
+// Chapters with their titles, moved to an output that begins at `start` of the input and ends
+// `length` later at the latest (both in AV_TIME_BASE units).
+void copy_chapters(const AVFormatContext& from, AVFormatContext& to, int64_t start, int64_t length);
+
 }  // namespace dehaze
 
 #endif  // TOOLS_MEDIA_METADATA_H

@@ -37,6 +37,11 @@ bool is_picture_format(const AVInputFormat& format) {
   return ends_with(format.name, "_pipe") || is_format(format, "image2");
 }
 
+bool is_companion(const AVStream& stream) {
+  const AVMediaType type = stream.codecpar->codec_type;
+  return type == AVMEDIA_TYPE_AUDIO || type == AVMEDIA_TYPE_SUBTITLE;
+}
+
 void check_readable_file(const std::string& path) {
   struct stat status = {};
   if (stat(path.c_str(), &status) != 0) throw Error(path + ": " + std::strerror(errno));
@@ -111,7 +116,7 @@ void Reader::choose_streams() {
   }
   for (unsigned i = 0; i < container_->nb_streams; ++i) {
     const AVStream* stream = container_->streams[i];
-    if (stream->codecpar->codec_type == AVMEDIA_TYPE_AUDIO) audio_.push_back(stream);
+    if (is_companion(*stream)) companions_.push_back(stream);
   }
 }
 
@@ -196,11 +201,11 @@ bool Reader::read_packet() {
     const int64_t end = packet_->pts + std::max<int64_t>(packet_->duration, 0);
     latest_end_ = std::max(latest_end_, av_rescale_q(end, stream->time_base, AV_TIME_BASE_Q));
   }
-  const bool is_used = stream == video_ || stream->codecpar->codec_type == AVMEDIA_TYPE_AUDIO;
+  const bool is_used = stream == video_ || is_companion(*stream);
   if (is_used && (packet_->flags & AV_PKT_FLAG_CORRUPT)) throw damaged("a packet is cut short");
-  if (stream->codecpar->codec_type == AVMEDIA_TYPE_AUDIO) {
-    pending_audio_.push_back(make_packet());
-    av_packet_move_ref(pending_audio_.back().get(), packet_.get());
+  if (is_companion(*stream)) {
+    pending_.push_back(make_packet());
+    av_packet_move_ref(pending_.back().get(), packet_.get());
   }
   return true;
 }
@@ -213,8 +218,10 @@ void Reader::check_complete_end() {
     throw damaged("the last frame is cut short");
   }
   if (!declares_duration(*container_)) return;
-  const int64_t start = container_->start_time != AV_NOPTS_VALUE ? container_->start_time : 0;
-  const int64_t found = latest_end_ - start;
+  // MKV states the last time stamp as its duration, MP4 the length.
+  const bool from_zero = is_format(*container_->iformat, "matroska");
+  const bool starts_late = container_->start_time != AV_NOPTS_VALUE && !from_zero;
+  const int64_t found = latest_end_ - (starts_late ? container_->start_time : 0);
   // A file that broke off between two blocks of data; small differences are common.
   if (found < container_->duration / 10 * 9 - AV_TIME_BASE) {
     char detail[96];
@@ -266,9 +273,13 @@ bool Reader::read_frame(AVFrame* frame) {
   }
 }
 
-void Reader::read_audio_until(int64_t end) {
+void Reader::read_companions_until(int64_t end) {
   std::vector<bool> done(container_->nb_streams, true);
-  for (const AVStream* stream : audio_) done[static_cast<size_t>(stream->index)] = false;
+  for (const AVStream* stream : companions_) {
+    // Subtitles may be minutes apart.
+    const bool is_sound = stream->codecpar->codec_type == AVMEDIA_TYPE_AUDIO;
+    done[static_cast<size_t>(stream->index)] = !is_sound;
+  }
   const auto note_packet = [&](const AVPacket& packet) {
     const AVRational time_base = container_->streams[packet.stream_index]->time_base;
     if (packet.pts != AV_NOPTS_VALUE &&
@@ -276,15 +287,15 @@ void Reader::read_audio_until(int64_t end) {
       done[static_cast<size_t>(packet.stream_index)] = true;
     }
   };
-  for (const PacketPtr& packet : pending_audio_) note_packet(*packet);
+  for (const PacketPtr& packet : pending_) note_packet(*packet);
   while (std::find(done.begin(), done.end(), false) != done.end()) {
-    const size_t before = pending_audio_.size();
+    const size_t before = pending_.size();
     try {
       if (!read_packet()) return;
     } catch (const Error&) {
       return;  // damage beyond the frames that were asked for
     }
-    if (pending_audio_.size() > before) note_packet(*pending_audio_.back());
+    if (pending_.size() > before) note_packet(*pending_.back());
   }
 }
 

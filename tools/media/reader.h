@@ -1,4 +1,5 @@
-// Input: a picture, a video or a Y4M pipe, as decoded frames and untouched audio packets.
+// Input: a picture, a video or a pipe, as decoded frames and untouched packets of what goes with
+// them: sound and subtitles.
 #ifndef TOOLS_MEDIA_READER_H
 #define TOOLS_MEDIA_READER_H
 
@@ -23,7 +24,8 @@ class Reader {
   bool is_picture() const { return is_picture_; }
   const AVFormatContext& container() const { return *container_; }
   const AVStream& video() const { return *video_; }
-  const std::vector<const AVStream*>& audio() const { return audio_; }
+  // Sound and subtitles.
+  const std::vector<const AVStream*>& companions() const { return companions_; }
   bool is_y4m() const;
 
   // Frames per second, {0, 1} if unknown.
@@ -39,11 +41,11 @@ class Reader {
   // base or AV_NOPTS_VALUE. False at the end. Throws Error if the data is damaged or breaks off.
   bool read_frame(AVFrame* frame);
 
-  // Audio packets that came along with the frames read so far.
-  std::deque<PacketPtr>& pending_audio() { return pending_audio_; }
+  // Packets of the companions that came along with the frames read so far.
+  std::deque<PacketPtr>& pending() { return pending_; }
 
-  // Reads on for audio only, until every audio stream has passed `end` (in AV_TIME_BASE units).
-  void read_audio_until(int64_t end);
+  // Reads on for the companions only, until all sound has passed `end` (in AV_TIME_BASE units).
+  void read_companions_until(int64_t end);
 
  private:
   void open(const std::string& url);
@@ -60,10 +62,10 @@ class Reader {
   IoPtr io_;  // outlives the container that reads through it
   InputPtr container_;
   AVStream* video_ = nullptr;
-  std::vector<const AVStream*> audio_;
+  std::vector<const AVStream*> companions_;
   DecoderPtr decoder_;
   PacketPtr packet_ = make_packet();
-  std::deque<PacketPtr> pending_audio_;
+  std::deque<PacketPtr> pending_;
   bool at_end_ = false;
   int64_t frames_ = 0;
   int64_t bytes_used_ = 0;      // position after the last complete packet

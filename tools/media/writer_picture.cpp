@@ -58,10 +58,26 @@ struct CloseFile {
   void operator()(std::FILE* file) const { std::fclose(file); }
 };
 
-void write_file(const AVPacket& packet, const std::string& path) {
+Bytes profile_of(const AVFrame& frame) {
+  const AVFrameSideData* profile = av_frame_get_side_data(&frame, AV_FRAME_DATA_ICC_PROFILE);
+  return profile == nullptr ? Bytes() : Bytes(profile->data, profile->data + profile->size);
+}
+
+// Adds what the encoder left out.
+Bytes with_blocks(const Bytes& file, const AVFrame& frame, OutputKind kind, const Bytes& exif) {
+  switch (kind) {
+    case OutputKind::kWebp:
+      return webp_with_blocks(file, exif, profile_of(frame), frame.width, frame.height);
+    case OutputKind::kPng:
+      return exif.empty() ? file : png_with_exif(file, exif);
+    default:
+      return exif.empty() ? file : jpeg_with_exif(file, exif);
+  }
+}
+
+void write_file(const Bytes& bytes, const std::string& path) {
   std::unique_ptr<std::FILE, CloseFile> file(std::fopen(path.c_str(), "wb"));
-  const size_t size = static_cast<size_t>(packet.size);
-  bool written = file && std::fwrite(packet.data, 1, size, file.get()) == size;
+  bool written = file && std::fwrite(bytes.data(), 1, bytes.size(), file.get()) == bytes.size();
   if (file) written = std::fclose(file.release()) == 0 && written;
   if (!written) throw Error(std::string("cannot write the picture: ") + std::strerror(errno));
 }
@@ -79,7 +95,8 @@ OutputSamples picture_samples(OutputKind kind, AVChromaLocation siting) {
   }
 }
 
-void write_picture(const AVFrame& frame, OutputKind kind, const std::string& path) {
+void write_picture(const AVFrame& frame, OutputKind kind, const std::string& path,
+                   const Bytes& exif) {
   const EncoderPtr encoder = open_encoder(frame, kind);
   FramePtr input = make_frame();
   check(av_frame_ref(input.get(), &frame), "cannot allocate a frame");
@@ -90,7 +107,9 @@ void write_picture(const AVFrame& frame, OutputKind kind, const std::string& pat
   check(avcodec_send_frame(encoder.get(), nullptr), what);
   PacketPtr packet = make_packet();
   check(avcodec_receive_packet(encoder.get(), packet.get()), what);
-  write_file(*packet, path);
+  const Bytes encoded(packet->data, packet->data + packet->size);
+  packet.reset();
+  write_file(with_blocks(encoded, frame, kind, exif), path);
 }
 
 }  // namespace dehaze

@@ -6,6 +6,7 @@
 
 #include "media/color_convert.h"
 #include "media/ffmpeg_handles.h"
+#include "media/picture_blocks.h"
 #include "output_kind.h"
 
 namespace dehaze {
@@ -15,8 +16,9 @@ namespace dehaze {
 OutputSamples picture_samples(OutputKind kind, AVChromaLocation siting);
 
 // Encodes the frame and writes it to `path`, which exists already; an ICC profile among its side
-// data is embedded in JPEG and PNG.
-void write_picture(const AVFrame& frame, OutputKind kind, const std::string& path);
+// data is embedded. exif: as find_exif() gives it, or empty.
+void write_picture(const AVFrame& frame, OutputKind kind, const std::string& path,
+                   const Bytes& exif = {});
 
 }  // namespace dehaze
 

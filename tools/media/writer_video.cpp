@@ -115,8 +115,9 @@ VideoWriter::VideoWriter(OutputKind kind, const std::string& path, const Reader&
   open_encoder(format, kind);
   add_video_stream(reader);
   if (stores_rotation(kind)) copy_display_matrix(reader.video(), video_);
-  if (!is_frames_only_) add_audio_streams(reader);
+  if (!is_frames_only_) companions_.add(reader, *container_, start_);
   copy_container_metadata(reader.container(), *container_);
+  if (!is_frames_only_) copy_chapters(reader.container(), *container_, start_, format.longest);
   open_file(url);
 }
 
@@ -169,24 +170,6 @@ void VideoWriter::add_video_stream(const Reader& reader) {
   copy_stream_metadata(reader.video(), *video_);
 }
 
-void VideoWriter::add_audio_streams(const Reader& reader) {
-  for (const AVStream* input : reader.audio()) {
-    const AVCodecParameters& codec = *input->codecpar;
-    if (avformat_query_codec(container_->oformat, codec.codec_id, FF_COMPLIANCE_NORMAL) != 1) {
-      throw Error(std::string("this kind of output cannot hold ") +
-                  avcodec_get_name(codec.codec_id) + " audio; use .mkv");
-    }
-    AVStream* output = avformat_new_stream(container_.get(), nullptr);
-    if (output == nullptr) throw std::bad_alloc();
-    check(avcodec_parameters_copy(output->codecpar, &codec), "cannot copy the audio");
-    output->codecpar->codec_tag = 0;  // the containers have codes of their own
-    output->time_base = input->time_base;
-    output->disposition = input->disposition;
-    copy_stream_metadata(*input, *output);
-    audio_[input->index] = {input->time_base, output};
-  }
-}
-
 void VideoWriter::open_file(const std::string& url) {
   const AVIOInterruptCB interrupt = {stop_on_signal, nullptr};
   container_->interrupt_callback = interrupt;
@@ -213,10 +196,10 @@ int64_t VideoWriter::place_in_time(int64_t pts, int64_t duration) {
   return pts;
 }
 
-void VideoWriter::write(AVFrame& frame, int64_t duration, std::deque<PacketPtr>& audio) {
+void VideoWriter::write(AVFrame& frame, int64_t duration, std::deque<PacketPtr>& companions) {
   const int64_t before = last_pts_;
   const int64_t pts = place_in_time(frame.pts, duration);
-  write_audio_before(av_rescale_q(pts, input_base_, AV_TIME_BASE_Q), audio);
+  write_companions_before(av_rescale_q(pts, input_base_, AV_TIME_BASE_Q), companions);
   if (is_frames_only_) {
     frame.pts = frames_;
   } else {
@@ -280,30 +263,12 @@ void VideoWriter::write_packet(AVPacket& packet) {
   if (container_->pb->error < 0) check(container_->pb->error, what);
 }
 
-void VideoWriter::write_audio_before(int64_t end, std::deque<PacketPtr>& audio) {
-  std::deque<PacketPtr> later;
-  for (PacketPtr& packet : audio) {
-    const auto track = audio_.find(packet->stream_index);
-    if (track == audio_.end()) continue;
-    const AVRational input_base = track->second.input_base;
-    const int64_t begin = packet->pts != AV_NOPTS_VALUE ? packet->pts : packet->dts;
-    if (begin != AV_NOPTS_VALUE && av_compare_ts(begin, input_base, end, AV_TIME_BASE_Q) >= 0) {
-      later.push_back(std::move(packet));
-      continue;
-    }
-    const int64_t shift = av_rescale_q(start_, AV_TIME_BASE_Q, input_base);
-    if (packet->pts != AV_NOPTS_VALUE) packet->pts -= shift;
-    if (packet->dts != AV_NOPTS_VALUE) packet->dts -= shift;
-    av_packet_rescale_ts(packet.get(), input_base, track->second.output->time_base);
-    packet->stream_index = track->second.output->index;
-    packet->pos = -1;
-    write_packet(*packet);
-  }
-  audio.swap(later);
+void VideoWriter::write_companions_before(int64_t end, std::deque<PacketPtr>& packets) {
+  companions_.pass_on(end, packets, [this](AVPacket& packet) { write_packet(packet); });
 }
 
-void VideoWriter::finish(std::deque<PacketPtr>& audio, int64_t audio_end) {
-  write_audio_before(audio_end, audio);
+void VideoWriter::finish(std::deque<PacketPtr>& companions, int64_t last) {
+  write_companions_before(last, companions);
   encode(nullptr);
   const char* const what = "cannot complete the output";
   check(av_write_trailer(container_.get()), what);

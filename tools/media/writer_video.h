@@ -1,4 +1,4 @@
-// Output: H.264 in MP4, MOV or MKV with copied audio; Y4M or raw frames as a file or on a pipe.
+// Output: H.264 in MP4, MOV or MKV with copied sound and subtitles; Y4M or raw frames as a file or on a pipe.
 #ifndef TOOLS_MEDIA_WRITER_VIDEO_H
 #define TOOLS_MEDIA_WRITER_VIDEO_H
 
@@ -7,8 +7,10 @@
 #include <map>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "media/color_convert.h"
+#include "media/companion_tracks.h"
 #include "media/ffmpeg_handles.h"
 #include "media/filter_pipe.h"
 #include "media/reader.h"
@@ -28,6 +30,7 @@ struct VideoFormat {
   AVColorTransferCharacteristic transfer;
   AVRational sample_aspect_ratio;  // 0/1 if unknown
   RawLayout raw_layout;            // of raw frames
+  int64_t longest;                 // AV_TIME_BASE units; INT64_MAX if it is not cut off
 };
 
 // 4:2:0 in the range, matrix and tags of the input. The size and aspect ratio are the caller's.
@@ -43,32 +46,29 @@ class VideoWriter {
   VideoWriter(OutputKind kind, const std::string& path, const Reader& reader,
               const VideoFormat& format);
 
+  // What of the input the output cannot hold and is therefore left out.
+  const std::vector<std::string>& left_out() const { return companions_.left_out(); }
+
   // frame.pts and `duration` in units of the input video's time base, AV_NOPTS_VALUE and 0 if
-  // unknown. Takes the audio packets off `audio` that begin before the frame.
-  void write(AVFrame& frame, int64_t duration, std::deque<PacketPtr>& audio);
+  // unknown. Takes the packets off `companions` that begin before the frame.
+  void write(AVFrame& frame, int64_t duration, std::deque<PacketPtr>& companions);
 
   // End of the last frame so far, in AV_TIME_BASE units of the input.
   int64_t end() const;
 
-  // Writes what is still held back, of the audio only what begins before `audio_end`
+  // Writes what is still held back, of the companions only what begins before `last`
   // (AV_TIME_BASE units), and completes the file.
-  void finish(std::deque<PacketPtr>& audio, int64_t audio_end);
+  void finish(std::deque<PacketPtr>& companions, int64_t last);
 
  private:
   void open_encoder(const VideoFormat& format, OutputKind kind);
   void add_video_stream(const Reader& reader);
-  void add_audio_streams(const Reader& reader);
   void open_file(const std::string& path);
   int64_t place_in_time(int64_t pts, int64_t duration);
   FramePtr in_raw_layout(const AVFrame& frame);
   void encode(const AVFrame* frame);
   void write_packet(AVPacket& packet);
-  void write_audio_before(int64_t end, std::deque<PacketPtr>& audio);
-
-  struct AudioTrack {
-    AVRational input_base;
-    AVStream* output;
-  };
+  void write_companions_before(int64_t end, std::deque<PacketPtr>& packets);
 
   bool is_frames_only_;
   RawLayout raw_layout_;
@@ -77,8 +77,8 @@ class VideoWriter {
   OutputPtr container_;
   EncoderPtr encoder_;
   PacketPtr packet_ = make_packet();
-  AVStream* video_ = nullptr;             // owned by the container
-  std::map<int, AudioTrack> audio_;       // by index of the input's stream
+  AVStream* video_ = nullptr;  // owned by the container
+  CompanionTracks companions_;
   std::map<int64_t, int64_t> durations_;  // of the frames in the encoder, by time stamp
   AVRational frame_rate_;
   AVRational input_base_;
