@@ -17,6 +17,7 @@ namespace {
 
 constexpr char kUsage[] =
     "haze_compare A B                 prints the PSNR (RGB) and SSIM (luma) of B against A\n"
+    "haze_compare --all A B           adds CIEDE2000, hue shift and the share of clipped pixels\n"
     "haze_compare --join A B OUT.png  writes a picture: the left half of A, the right half of B";
 
 // Sides of at least this many pixels are needed for the SSIM window.
@@ -44,14 +45,19 @@ void check_same_size(const RgbPicture& a, const RgbPicture& b) {
               std::to_string(b.height));
 }
 
-void compare(const std::string& path_a, const std::string& path_b) {
+void compare(const std::string& path_a, const std::string& path_b, bool all) {
   const RgbPicture a = read_picture(path_a);
   const RgbPicture b = read_picture(path_b);
   check_same_size(a, b);
   if (a.width < kSmallestSide || a.height < kSmallestSide) {
     throw Error("the pictures are too small to compare");
   }
-  std::printf("psnr %.2f dB ssim %.4f\n", psnr_rgb(a, b), ssim_luma(a, b));
+  std::printf("psnr %.2f dB ssim %.4f", psnr_rgb(a, b), ssim_luma(a, b));
+  if (all) {
+    std::printf(" ciede2000 %.3f hue %.3f degrees clipped %.3f %%", mean_ciede2000(a, b),
+                mean_hue_shift(a, b), 100 * clipped_share(b));
+  }
+  std::printf("\n");
 }
 
 // One view, split in the middle by a thin white line: the eye meets the difference where it looks.
@@ -88,7 +94,9 @@ int guarded_main(int argc, char** argv) {
     if (argc == 5 && first == "--join") {
       join(argv[2], argv[3], argv[4]);
     } else if (argc == 3 && first.rfind("--", 0) != 0) {
-      compare(argv[1], argv[2]);
+      compare(argv[1], argv[2], false);
+    } else if (argc == 4 && first == "--all") {
+      compare(argv[2], argv[3], true);
     } else if (first == "--help") {
       std::puts(kUsage);
     } else {

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cstdio>
 
-#include "photo_engine.h"
+#include "photo/photo_engine.h"
 #include "preview_engine.h"
 
 namespace dehaze {
@@ -43,7 +43,7 @@ std::unique_ptr<Engine> make_engine(EngineKind kind, const EngineOptions& option
   if (kind == EngineKind::kPreview) {
     return std::make_unique<PreviewEngine>(width, height, options, console);
   }
-  return std::make_unique<PhotoEngine>(width, height, options.strength, frames_per_second);
+  return std::make_unique<PhotoEngine>(options.strength, frames_per_second);
 }
 
 }  // namespace dehaze

@@ -1,8 +1,11 @@
 #include "picture_metrics.h"
 
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <limits>
+
+#include "color_difference.h"
 
 namespace dehaze {
 namespace {
@@ -100,6 +103,35 @@ double ssim_luma(const RgbPicture& picture_a, const RgbPicture& picture_b) {
     sum += (2 * means + kC1) * (2 * covariance + kC2) / ((squares + kC1) * (variances + kC2));
   }
   return sum / static_cast<double>(mean_a.size());
+}
+
+double mean_ciede2000(const RgbPicture& a, const RgbPicture& b) {
+  double sum = 0;
+  for (size_t i = 0; i < a.bytes.size(); i += 3) {
+    sum += ciede2000(lab_of_srgb(&a.bytes[i]), lab_of_srgb(&b.bytes[i]));
+  }
+  return sum / static_cast<double>(a.bytes.size() / 3);
+}
+
+double mean_hue_shift(const RgbPicture& reference, const RgbPicture& picture) {
+  double sum = 0;
+  double weights = 0;
+  for (size_t i = 0; i < reference.bytes.size(); i += 3) {
+    const Lab wanted = lab_of_srgb(&reference.bytes[i]);
+    const double weight = chroma(wanted);
+    sum += weight * hue_difference(wanted, lab_of_srgb(&picture.bytes[i]));
+    weights += weight;
+  }
+  return weights > 0 ? sum / weights : 0;
+}
+
+double clipped_share(const RgbPicture& picture) {
+  size_t clipped = 0;
+  for (size_t i = 0; i < picture.bytes.size(); i += 3) {
+    const auto begin = picture.bytes.begin() + static_cast<std::ptrdiff_t>(i);
+    if (std::any_of(begin, begin + 3, [](uint8_t v) { return v == 0 || v == 255; })) ++clipped;
+  }
+  return static_cast<double>(clipped) / static_cast<double>(picture.bytes.size() / 3);
 }
 
 }  // namespace dehaze

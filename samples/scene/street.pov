@@ -21,8 +21,12 @@
 #ifndef (Fog) #declare Fog = 0; #end
 #ifndef (Lights) #declare Lights = 1; #end
 
-#declare FogDistance = 100;
-#declare FogLight = <200, 203, 208> / 255;
+#ifndef (FogDistance) #declare FogDistance = 100; #end
+#ifndef (LightR)
+  #declare FogLight = <200, 203, 208> / 255;
+#else
+  #declare FogLight = <LightR, LightG, LightB> / 255;
+#end
 
 global_settings {
   assumed_gamma srgb

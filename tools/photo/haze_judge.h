@@ -1,0 +1,62 @@
+// How strongly the haze is to be taken out, and what stays the same from frame to frame.
+#ifndef TOOLS_PHOTO_HAZE_JUDGE_H
+#define TOOLS_PHOTO_HAZE_JUDGE_H
+
+#include <array>
+#include <optional>
+
+#include "photo/haze_map.h"
+
+namespace dehaze {
+
+// Mean of the values so far; from `memory` values on it forgets the old ones.
+class SteadyValue {
+ public:
+  void add(double value, double memory);
+  double mean() const { return mean_; }
+
+ private:
+  double count_ = 0;
+  double mean_ = 0;
+};
+
+// What a share of haze becomes.
+struct Removal {
+  double amount;              // 0 ... 1, of the haze found
+  double least_transmission;  // below it nothing is amplified any more
+
+  // Of a share of haze in [0, 1].
+  double transmission(double share) const;
+};
+
+// Judges frame after frame. In a video light and removal change slowly, so that a still scene does
+// not flicker, and start anew at a cut.
+class HazeJudge {
+ public:
+  // Without a strength (0 ... 100) it is judged. frames_per_second: 0 if unknown.
+  HazeJudge(std::optional<int> strength, double frames_per_second);
+
+  // To be called first for each frame: looks at its light.
+  void look_at(BgrImage& small);
+
+  // Of the frames so far; whole numbers, which change only when the mean has left them.
+  const Light& light() const { return light_; }
+  std::array<double, 3> exact_light() const;  // blue, green, red
+
+  // share: of the frame's haze.
+  Removal judge(const Plane& share);
+
+ private:
+  bool is_cut(const BgrImage& small) const;
+
+  std::optional<int> strength_;
+  double memory_;
+  std::array<SteadyValue, 3> light_means_;
+  SteadyValue haze_;
+  Light light_ = {255, 255, 255};
+  std::optional<BgrImage> last_;
+};
+
+}  // namespace dehaze
+
+#endif  // TOOLS_PHOTO_HAZE_JUDGE_H

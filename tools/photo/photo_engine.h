@@ -1,0 +1,31 @@
+// Haze removal at full resolution, from the library's building blocks.
+#ifndef TOOLS_PHOTO_PHOTO_ENGINE_H
+#define TOOLS_PHOTO_PHOTO_ENGINE_H
+
+#include <cstdint>
+#include <optional>
+#include <vector>
+
+#include "engine.h"
+#include "photo/haze_judge.h"
+
+namespace dehaze {
+
+class PhotoEngine : public Engine {
+ public:
+  // Without a strength it is judged from the frames. frames_per_second: 0 for pictures.
+  PhotoEngine(std::optional<int> strength, double frames_per_second);
+
+  void process(Nv21Frame& frame) override;
+  HazeFindings findings() const override;
+  std::vector<float> transmission() const override;
+
+ private:
+  HazeJudge judge_;
+  Removal removal_ = {0, 1};
+  std::vector<uint8_t> codes_;  // of the last frame
+};
+
+}  // namespace dehaze
+
+#endif  // TOOLS_PHOTO_PHOTO_ENGINE_H
