@@ -70,7 +70,7 @@ bool HazeJudge::is_cut(const BgrImage& small) const {
   return sum > kCut * static_cast<double>(small.bytes.size());
 }
 
-void HazeJudge::look_at(BgrImage& small) {
+bool HazeJudge::look_at(BgrImage& small) {
   const bool starts = is_cut(small);
   if (starts) {
     light_means_ = {};
@@ -85,6 +85,7 @@ void HazeJudge::look_at(BgrImage& small) {
       light_[c] = static_cast<uint8_t>(std::lround(mean));
     }
   }
+  return starts;
 }
 
 std::array<double, 3> HazeJudge::exact_light() const {

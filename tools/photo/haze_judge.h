@@ -36,8 +36,9 @@ class HazeJudge {
   // Without a strength (0 ... 100) it is judged. frames_per_second: 0 if unknown.
   HazeJudge(std::optional<int> strength, double frames_per_second);
 
-  // To be called first for each frame: looks at its light.
-  void look_at(BgrImage& small);
+  // To be called first for each frame: looks at its light. True for the first frame after a cut, and
+  // the first of all.
+  bool look_at(BgrImage& small);
 
   // Of the frames so far; whole numbers, which change only when the mean has left them.
   const Light& light() const { return light_; }

@@ -75,15 +75,9 @@ DarkShares dark_shares(BgrImage& image, Light light) {
   return shares;
 }
 
-// The guided filter explains a plane by its guide: plane = slope * guide + offset around each pixel.
-struct GuidedModel {
-  Plane slope;
-  Plane offset;
-};
-
 // Composed from the float box filters instead of GuidedFilterPreview for its 8-bit codes end at a
 // transmission of 0.2 and would be amplified; README.md has the comparison.
-GuidedModel fit_guided_model(Plane& plane, Plane& guide) {
+GuidedModel fit_to_guide(Plane& plane, Plane& guide) {
   const int w = plane.width;
   const int h = plane.height;
   const int radius =
@@ -137,17 +131,6 @@ float largest_share(const uint8_t* bgr, const Light& light) {
   return 1 - std::min(least_transmission, 1.0F);
 }
 
-// `plane` comes in as the guide and goes out as the share.
-void apply_guided_model(const Plane& slope, const Plane& offset, const BgrImage& image,
-                        const Light& light, Plane& plane) {
-  const uint8_t* bgr = image.bytes.data();
-  for (size_t i = 0; i < plane.values.size(); ++i) {
-    const float share = offset.values[i] + slope.values[i] * plane.values[i];
-    plane.values[i] = std::clamp(share, 0.0F, largest_share(bgr, light));
-    bgr += 3;
-  }
-}
-
 }  // namespace
 
 BgrImage half_resolution(Nv21Frame& frame) {
@@ -187,15 +170,22 @@ Light estimate_light(BgrImage& small) {
   return light;
 }
 
-HazeMap estimate_haze(BgrImage& small, BgrImage& half, const Light& light) {
+GuidedModel fit_guided_model(BgrImage& small, const Light& light) {
   DarkShares shares = dark_shares(small, light);
-  GuidedModel model = fit_guided_model(shares.patch, shares.pixel);
-  HazeMap map = {std::move(shares.pixel), dark_shares(half, light).pixel};
-  apply_guided_model(model.slope, model.offset, small, light, map.small);
-  model.slope = enlarged(std::move(model.slope), half.width, half.height);
-  model.offset = enlarged(std::move(model.offset), half.width, half.height);
-  apply_guided_model(model.slope, model.offset, half, light, map.half);
-  return map;
+  return fit_to_guide(shares.patch, shares.pixel);
+}
+
+Plane share_of_haze(BgrImage& image, const GuidedModel& model, const Light& light) {
+  const Plane slope = enlarged(model.slope, image.width, image.height);
+  const Plane offset = enlarged(model.offset, image.width, image.height);
+  Plane share = dark_shares(image, light).pixel;
+  const uint8_t* bgr = image.bytes.data();
+  for (size_t i = 0; i < share.values.size(); ++i) {
+    const float value = offset.values[i] + slope.values[i] * share.values[i];
+    share.values[i] = std::clamp(value, 0.0F, largest_share(bgr, light));
+    bgr += 3;
+  }
+  return share;
 }
 
 }  // namespace dehaze

@@ -29,14 +29,18 @@ BgrImage reduced(const BgrImage& image);
 // Colour of the thickest haze: the mean over the brightest part of the dark channel.
 Light estimate_light(BgrImage& small);
 
-// Share of the haze.
-struct HazeMap {
-  Plane small;
-  Plane half;
+// What the guided filter learns: around each pixel of the small picture the share of the haze is
+// slope * (share by the pixel alone) + offset.
+struct GuidedModel {
+  Plane slope;
+  Plane offset;
 };
 
-// `small` as made from `half` by reduced().
-HazeMap estimate_haze(BgrImage& small, BgrImage& half, const Light& light);
+GuidedModel fit_guided_model(BgrImage& small, const Light& light);
+
+// Share of the haze in each pixel of an image that is the small one or one that it was made from by
+// reduced(). No share would bring a channel of the result beyond its range.
+Plane share_of_haze(BgrImage& image, const GuidedModel& model, const Light& light);
 
 }  // namespace dehaze
 

@@ -17,10 +17,10 @@ void PhotoEngine::process(Nv21Frame& frame) {
   {
     BgrImage half = half_resolution(frame);
     BgrImage small = reduced(half);
-    judge_.look_at(small);
-    const HazeMap map = estimate_haze(small, half, judge_.light());
-    removal_ = judge_.judge(map.small);
-    codes_ = recovery_codes(map.half, removal_);
+    if (judge_.look_at(small)) steady_model_.restart();
+    const GuidedModel& model = steady_model_.follow(fit_guided_model(small, judge_.light()), small);
+    removal_ = judge_.judge(share_of_haze(small, model, judge_.light()));
+    codes_ = recovery_codes(share_of_haze(half, model, judge_.light()), removal_);
   }
   recover(frame, codes_, judge_.exact_light());
   times_.estimate_ms.push_back(

@@ -8,6 +8,7 @@
 
 #include "engine.h"
 #include "photo/haze_judge.h"
+#include "photo/steady_model.h"
 
 namespace dehaze {
 
@@ -22,6 +23,7 @@ class PhotoEngine : public Engine {
 
  private:
   HazeJudge judge_;
+  SteadyModel steady_model_;
   Removal removal_ = {0, 1};
   std::vector<uint8_t> codes_;  // of the last frame
 };
