@@ -6,6 +6,7 @@
 #include "core/numeric.h"
 #include "haze_preview.h"
 #include "recover/frame_recovery_kernels.h"
+#include "recover/frame_recovery_neon.h"
 
 namespace haze::recover {
 namespace {
@@ -46,7 +47,13 @@ struct FromFormula {
 
   // Recovers the row's first blocks in vectors where there are any; returns how many.
   int leading_blocks(BlockRow row, const uint8_t* codes, int blocks, ChromaLayout layout) const {
-#if HAZE_X86
+#if HAZE_NEON
+    return layout == ChromaLayout::kInterleavedVu
+               ? recover_blocks_neon<ChromaLayout::kInterleavedVu>(row, codes, blocks, anchor,
+                                                                   LutTablePreview)
+               : recover_blocks_neon<ChromaLayout::kPlanarUv>(row, codes, blocks, anchor,
+                                                              LutTablePreview);
+#elif HAZE_X86
     if (const auto kernel =
             layout == ChromaLayout::kInterleavedVu
                 ? x86_kernel(recover_nv21_blocks_avx2, recover_nv21_blocks_avx512)
@@ -122,7 +129,7 @@ bool prefers_formula() {
 #if HAZE_X86
   return cpu_level() != CpuLevel::kPortable;
 #else
-  return false;
+  return HAZE_NEON;
 #endif
 }
 

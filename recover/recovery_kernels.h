@@ -8,7 +8,7 @@
 namespace haze::recover {
 
 // 1 / t for a transmission code: t = (code + 40) / 200.
-inline float recovery_factor(int code) { return static_cast<float>(200.0 / (code + 40)); }
+constexpr float recovery_factor(int code) { return static_cast<float>(200.0 / (code + 40)); }
 
 // clamp(trunc(anchor + (sample - anchor) * factor)). The product is rounded before the sum.
 inline uint8_t recover_sample(int anchor, float factor, int sample) {

@@ -6,6 +6,8 @@
 #include <array>
 #include <memory>
 
+#include "haze_preview.h"
+#include "recover/frame_recovery_neon.h"
 #include "recover/recovery_tables.h"
 #include "tests/reference/frame_recovery.h"
 #include "tests/support/bytes_match.h"
@@ -44,6 +46,32 @@ TEST(RecoveryKernels, PortableRowIsExactForEveryAnchorAndCode) {
 #if HAZE_NEON
 TEST(RecoveryKernels, NeonRowIsExactForEveryAnchorAndCode) {
   expect_every_anchor_and_code(recover::recover_all_neon);
+}
+
+TEST(RecoveryKernels, NeonArithmeticIsExactForEveryAnchorAndCode) {
+  expect_every_anchor_and_code([](int anchor, float factor, uint8_t* recovered) {
+    const uint8_t byte = static_cast<uint8_t>(anchor);
+    const recover::FactorsNeon factors = {vdupq_n_f32(factor), vdupq_n_f32(factor)};
+    uint8_t samples[8];
+    for (int first = 0; first < 256; first += 8) {
+      for (int k = 0; k < 8; ++k) samples[k] = static_cast<uint8_t>(first + k);
+      vst1_u8(recovered + first, recover::high_bytes_neon(recover::recover_eight_neon(
+                                     vld1_u8(samples), factors, recover::anchor_neon(byte, byte))));
+    }
+  });
+}
+
+TEST(RecoveryKernels, NeonToneCurveIsExactForEveryByte) {
+  const recover::ToneCurveNeon tone = recover::load_tone_curve_neon(LutTablePreview);
+  Recovered bytes;
+  Recovered expected;
+  for (size_t i = 0; i < bytes.size(); ++i) {
+    bytes[i] = static_cast<uint8_t>(i);
+    expected[i] = LutTablePreview[i];
+  }
+  for (size_t i = 0; i < bytes.size(); i += 16)
+    vst1q_u8(bytes.data() + i, recover::brighten_neon(vld1q_u8(bytes.data() + i), tone));
+  EXPECT_TRUE(bytes_match(bytes, expected));
 }
 #endif
 
