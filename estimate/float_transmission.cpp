@@ -8,7 +8,7 @@
 
 namespace {
 
-using haze::filter::MostFloat;
+using haze::filter::MostNormalFloat;
 
 // Share of the haze that is taken away, by level.
 constexpr float kStrengths[10] = {0.0f, 0.1f, 0.2f, 0.3f, 0.4f, 0.5f, 0.6f, 0.7f, 0.8f, 0.9f};
@@ -36,7 +36,9 @@ float larger(float a, float b) { return a < b ? b : a; }
 void largest_transmissions(const uint8_t* pixels, const float (&scales)[3], float* t,
                            size_t count) {
   size_t i = 0;
-#if HAZE_X86
+#if HAZE_NEON
+  i = haze::estimate::largest_transmissions_neon(pixels, scales, t, count);
+#elif HAZE_X86
   if (const auto kernel = haze::x86_kernel(haze::estimate::largest_transmissions_avx2,
                                            haze::estimate::largest_transmissions_avx512))
     i = kernel(pixels, scales, haze::estimate::kLeastFloatTransmission, t, count);
@@ -59,9 +61,9 @@ void EstimateTPreview(unsigned char* src, unsigned char* A, float* t, float* tRa
   if (count == 0) return;
   // All memory at first, so that either both maps are written or none.
   haze::Scratch<float> rows(count);
-  haze::filter::WindowLines<MostFloat> line(w, kRadius, 1);
-  haze::filter::WindowLines<MostFloat> columns(h, kRadius,
-                                               haze::filter::column_bundle<MostFloat>(w));
+  haze::filter::WindowLines<MostNormalFloat> line(w, kRadius, 1);
+  haze::filter::WindowLines<MostNormalFloat> columns(
+      h, kRadius, haze::filter::column_bundle<MostNormalFloat>(w));
   if (!rows || !line || !columns) return;
   const float strength = strength_of(level);
   float scales[3];

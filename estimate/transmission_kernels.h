@@ -12,6 +12,7 @@
 #include "core/cpu_level.h"
 #include "core/numeric.h"
 #include "core/target.h"
+#include "estimate/byte_floats_neon.h"
 #include "estimate/transmission_code.h"
 
 namespace haze::estimate {
@@ -117,18 +118,6 @@ struct GroupVectors {
   float32x4_t strength;
   float32x4_t minus_inv_a;
 };
-
-// Every fourth of sixteen bytes, as floats: byte k of each 32-bit word. Masked where it stands and
-// converted as a number with 8 k bits of fraction, which is exact and spares the widening.
-template <int kByte>
-inline float32x4_t byte_to_float_neon(uint8x16_t bytes) {
-  const uint32x4_t words = vreinterpretq_u32_u8(bytes);
-  const uint32x4_t masked = vandq_u32(words, vdupq_n_u32(0xFFu << (8 * kByte)));
-  if constexpr (kByte == 0)
-    return vcvtq_f32_u32(masked);
-  else
-    return vcvtq_n_f32_u32(masked, 8 * kByte);
-}
 
 // trunc(200 t) of byte k of each word. With kClampsFloats t is clamped: vmin and vmax hand on a value
 // that is not a number, and the conversion turns it into 0. Otherwise t is at most 1, and negative

@@ -58,12 +58,36 @@ struct MostFloat {
 #if HAZE_X86
   static auto* x86() { return x86_kernel(combine_most_floats_avx2, combine_most_floats_avx512); }
 #endif
-#if HAZE_NEON
+#if HAZE_NEON && defined(__aarch64__)
   static constexpr size_t kLanes = 4;
   static void combine_lanes(const Value* earlier, const Value* later, Value* to) {
     const float32x4_t a = vld1q_f32(earlier);
     const float32x4_t b = vld1q_f32(later);
     vst1q_f32(to, vbslq_f32(vcgeq_f32(b, a), b, a));
+  }
+#elif HAZE_NEON
+  // NEON of 32-bit ARM compares numbers below the normal range as zeros, hence by their bits: as
+  // integers, floats are in order, or in reverse order where both are negative. Zeros of either sign
+  // are equal.
+  static constexpr size_t kLanes = 4;
+  static void combine_lanes(const Value* earlier, const Value* later, Value* to) {
+    const int32x4_t a = vreinterpretq_s32_f32(vld1q_f32(earlier));
+    const int32x4_t b = vreinterpretq_s32_f32(vld1q_f32(later));
+    const int32x4_t both_negative = vshrq_n_s32(vandq_s32(a, b), 31);
+    const uint32x4_t not_zeros = vtstq_s32(vorrq_s32(a, b), vdupq_n_s32(INT32_MAX));
+    const uint32x4_t above = veorq_u32(vcgtq_s32(a, b), vreinterpretq_u32_s32(both_negative));
+    const int32x4_t most = vbslq_s32(vandq_u32(above, not_zeros), a, b);
+    vst1q_f32(to, vreinterpretq_f32_s32(most));
+  }
+#endif
+};
+
+// The same for planes without zeros and numbers below the normal range.
+struct MostNormalFloat : MostFloat {
+#if HAZE_NEON
+  static constexpr size_t kLanes = 4;
+  static void combine_lanes(const Value* earlier, const Value* later, Value* to) {
+    vst1q_f32(to, vmaxq_f32(vld1q_f32(earlier), vld1q_f32(later)));
   }
 #endif
 };
@@ -75,10 +99,20 @@ inline void combine_lines(const typename Extremum::Value* earlier,
                           typename Extremum::Value* __restrict to, size_t count) {
   size_t i = 0;
 #if HAZE_NEON
-  for (; i + Extremum::kLanes <= count; i += Extremum::kLanes)
-    Extremum::combine_lanes(earlier + i, later + i, to + i);
+  constexpr size_t kLanes = Extremum::kLanes;
+  const size_t whole = count - count % (2 * kLanes);
+  for (const typename Extremum::Value* const stop = to + whole; to != stop; to += 2 * kLanes) {
+    Extremum::combine_lanes(earlier, later, to);
+    Extremum::combine_lanes(earlier + kLanes, later + kLanes, to + kLanes);
+    earlier += 2 * kLanes;
+    later += 2 * kLanes;
+  }
+  count -= whole;
 #elif HAZE_X86
   if (const auto kernel = Extremum::x86()) i = kernel(earlier, later, to, count);
+#endif
+#if HAZE_NEON && defined(__clang__)
+#pragma clang loop vectorize(disable)  // by the same comparison of NEON
 #endif
   for (; i < count; ++i) to[i] = Extremum::combine(earlier[i], later[i]);
 }

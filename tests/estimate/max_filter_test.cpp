@@ -25,9 +25,10 @@ constexpr float kNotANumber = std::numeric_limits<float>::quiet_NaN();
 size_t area(int width, int height) { return static_cast<size_t>(width * height); }
 
 // Lines that make a running maximum keep, replace and look for its maximum again.
-enum class LineMood { kNoise, kTies, kFalling, kRising, kZeros, kInfinities };
-constexpr LineMood kLineMoods[] = {LineMood::kNoise,  LineMood::kTies,  LineMood::kFalling,
-                                   LineMood::kRising, LineMood::kZeros, LineMood::kInfinities};
+enum class LineMood { kNoise, kTies, kFalling, kRising, kZeros, kTiny, kInfinities };
+constexpr LineMood kLineMoods[] = {LineMood::kNoise,     LineMood::kTies,  LineMood::kFalling,
+                                   LineMood::kRising,    LineMood::kZeros, LineMood::kTiny,
+                                   LineMood::kInfinities};
 
 Plane make_line(Random& random, LineMood mood, int count) {
   Plane line;
@@ -49,6 +50,9 @@ Plane make_line(Random& random, LineMood mood, int count) {
         break;
       case LineMood::kZeros:
         line.push_back(jitter == 0.0f ? 0.0f : (jitter == 1.0f ? -0.0f : -1.0f));
+        break;
+      case LineMood::kTiny:  // below the normal range
+        line.push_back(std::numeric_limits<float>::denorm_min() * (5.0f * jitter - 5.0f));
         break;
       case LineMood::kInfinities:
         line.push_back(jitter == 0.0f ? kInfinity : (jitter == 1.0f ? -kInfinity : position));
@@ -132,7 +136,7 @@ TEST(MaxFilterRow, EveryRadiusAndLength) {
   Random random(test_seed());
   for (int radius = 0; radius <= 20; ++radius)
     for (int count = 1; count <= 60; ++count)
-      compare_line(make_line(random, kLineMoods[(count + radius) % 6], count), radius,
+      compare_line(make_line(random, kLineMoods[(count + radius) % 7], count), radius,
                    1 + (count + radius / 2) % 4);
 }
 
