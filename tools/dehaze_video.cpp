@@ -2,11 +2,14 @@
 
 #include <algorithm>
 #include <cmath>
+#include <deque>
+#include <iterator>
 #include <limits>
 #include <optional>
 #include <string>
 #include <utility>
 
+#include "bounded_queue.h"
 #include "errors.h"
 #include "frame_path.h"
 #include "interrupt.h"
@@ -16,6 +19,7 @@
 #include "media/writer_video.h"
 #include "output_file.h"
 #include "progress.h"
+#include "stage_threads.h"
 
 namespace dehaze {
 namespace {
@@ -72,21 +76,105 @@ VideoFormat turned(VideoFormat format, const Orientation& turn) {
   return format;
 }
 
+// A frame on its way, with the packets that were read along with it.
+struct Shot {
+  FramePtr frame;
+  std::deque<PacketPtr> companions;
+};
+
+Shot take_shot(Reader& reader, FramePtr frame) {
+  Shot shot = {std::move(frame), {}};
+  shot.companions.swap(reader.pending());
+  return shot;
+}
+
+// Large frames wait in shorter queues.
+size_t queue_length(const AVFrame& frame) {
+  constexpr int64_t kMostBytes = 64 << 20;
+  constexpr int64_t kMostFrames = 4;
+  const int64_t bytes = int64_t{frame.width} * frame.height * 3 / 2;
+  return static_cast<size_t>(std::clamp<int64_t>(kMostBytes / bytes, 1, kMostFrames));
+}
+
+// Takes the haze out of one frame after the other.
+class Dehazer {
+ public:
+  Dehazer(FramePath& path, const VideoFormat& format, const Orientation& turn)
+      : path_(path),
+        from_nv21_(format.width, format.height, path.siting(), format.samples),
+        turn_(turn) {}
+
+  FramePtr run(const AVFrame& input) {
+    FramePtr output = from_nv21_.convert(path_.run(input));
+    if (!turn_.is_upright()) {
+      if (!turner_) turner_.emplace(*output, turn_.filter());
+      output = turner_->run(*output);
+    }
+    output->pts = input.pts;
+    output->pkt_duration = input.pkt_duration;
+    return output;
+  }
+
+ private:
+  FramePath& path_;
+  FromNv21 from_nv21_;
+  Orientation turn_;
+  std::optional<FilterPipe> turner_;
+};
+
+// Decodes, dehazes and encodes up to `limit` frames at the same time; the first one is decoded
+// already. Returns their number. What was read along with them and not written yet is left in
+// `companions`.
+int64_t run_stages(Reader& reader, FramePtr first, int64_t limit, Dehazer& dehazer,
+                   VideoWriter& writer, Progress& progress, std::deque<PacketPtr>& companions) {
+  BoundedQueue<Shot> decoded(queue_length(*first));
+  BoundedQueue<Shot> dehazed(queue_length(*first));
+  int64_t frames = 0;
+  StageThreads stages([&] {
+    decoded.cancel();
+    dehazed.cancel();
+  });
+  stages.start([&] {
+    FramePtr frame = std::move(first);
+    while (decoded.push(take_shot(reader, std::move(frame)))) {
+      frame = make_frame();
+      if (++frames == limit || !reader.read_frame(frame.get())) break;
+    }
+    decoded.close();
+  });
+  stages.start([&] {
+    while (std::optional<Shot> shot = decoded.pop()) {
+      shot->frame = dehazer.run(*shot->frame);
+      // Here, because this stage is the only one that may have notes for the console.
+      progress.advance();
+      if (!dehazed.push(std::move(*shot))) return;
+    }
+    dehazed.close();
+  });
+  stages.start([&] {
+    while (std::optional<Shot> shot = dehazed.pop()) {
+      std::move(shot->companions.begin(), shot->companions.end(), std::back_inserter(companions));
+      writer.write(*shot->frame, shot->frame->pkt_duration, companions);
+    }
+  });
+  stages.join();
+  return frames;
+}
+
 }  // namespace
 
 Outcome dehaze_video(Reader& reader, const Options& options, Console& console) {
   const OutputKind kind = options.output_kind;
-  const FramePtr input = make_frame();
-  if (!reader.read_frame(input.get())) throw Error(reader.path() + ": holds no video");
+  FramePtr first = make_frame();
+  if (!reader.read_frame(first.get())) throw Error(reader.path() + ": holds no video");
 
-  FramePath path(*input, false, frames_per_second(reader), options.engine, console);
+  FramePath path(*first, false, frames_per_second(reader), options.engine, console);
   note_what_is_lost(reader, path.size(), kind, console);
   const Orientation turn = turn_for(reader, kind);
-  VideoFormat format = format_before_turn(reader, *input, path, kind);
+  VideoFormat format = format_before_turn(reader, *first, path, kind);
   format.raw_layout = options.raw_output;
   format.longest = length_of(options.max_frames, frames_per_second(reader));
-  FromNv21 from_nv21(format.width, format.height, path.siting(), format.samples);
-  std::optional<FilterPipe> turner;
+  Dehazer dehazer(path, format, turn);
 
   std::optional<OutputFile> file;
   if (options.output != "-") file.emplace(options.output, options.force);
@@ -102,24 +190,18 @@ Outcome dehaze_video(Reader& reader, const Options& options, Console& console) {
                     expected > 0 || options.max_frames > 0
                         ? std::min(limit, expected > 0 ? expected : limit)
                         : 0);
-  int64_t frames = 0;
-  do {
-    FramePtr output = from_nv21.convert(path.run(*input));
-    if (!turn.is_upright()) {
-      if (!turner) turner.emplace(*output, turn.filter());
-      output = turner->run(*output);
-    }
-    output->pts = input->pts;
-    writer.write(*output, input->pkt_duration, reader.pending());
-    progress.advance();
-  } while (++frames < limit && reader.read_frame(input.get()));
+  std::deque<PacketPtr> companions;
+  const int64_t frames =
+      run_stages(reader, std::move(first), limit, dehazer, writer, progress, companions);
 
   int64_t last = std::numeric_limits<int64_t>::max();
   if (frames == limit) {
     last = writer.end();
     if (!is_frames_only(kind)) reader.read_companions_until(last);
   }
-  writer.finish(reader.pending(), last);
+  std::move(reader.pending().begin(), reader.pending().end(), std::back_inserter(companions));
+  reader.pending().clear();
+  writer.finish(companions, last);
   throw_if_interrupted();
   if (file) file->commit();
   return {path.engine().report(), output_format.width, output_format.height, frames};

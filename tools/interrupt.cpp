@@ -5,6 +5,8 @@
 #include <string.h>
 #include <unistd.h>
 
+#include <atomic>
+
 #include "errors.h"
 
 namespace dehaze {
@@ -24,6 +26,10 @@ void on_signal(int number) {
   received_signal = number;
 }
 
+void do_nothing(int) {}
+
+std::atomic<bool> stop_requested{false};
+
 }  // namespace
 
 void watch_signals() {
@@ -36,9 +42,17 @@ void watch_signals() {
     sigaction(number, &action, nullptr);
   }
   signal(SIGPIPE, SIG_IGN);
+  action.sa_handler = do_nothing;
+  sigaction(SIGUSR1, &action, nullptr);
 }
 
 int pending_signal() { return received_signal; }
+
+void request_stop() { stop_requested = true; }
+
+bool is_stopping() { return received_signal != 0 || stop_requested; }
+
+void wake_thread(pthread_t thread) { pthread_kill(thread, SIGUSR1); }
 
 void throw_if_interrupted() {
   if (received_signal != 0) throw Interrupted(received_signal);

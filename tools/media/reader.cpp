@@ -22,7 +22,7 @@ namespace {
 
 constexpr double kRateTolerance = 0.01;
 
-int stop_on_signal(void*) { return pending_signal() != 0; }
+int stop_waiting(void*) { return is_stopping(); }
 
 bool ends_with(const std::string& text, const std::string& end) {
   return text.size() >= end.size() && text.compare(text.size() - end.size(), end.size(), end) == 0;
@@ -76,7 +76,7 @@ Reader::Reader(const std::string& path, const std::optional<RawFormat>& raw)
 }
 
 void Reader::open(const std::string& url) {
-  const AVIOInterruptCB interrupt = {stop_on_signal, nullptr};
+  const AVIOInterruptCB interrupt = {stop_waiting, nullptr};
   AVIOContext* io = nullptr;
   check(avio_open2(&io, url.c_str(), AVIO_FLAG_READ, &interrupt, nullptr), path_);
   io_.reset(io);

@@ -52,7 +52,7 @@ const char* encoder_name(OutputKind kind) {
   }
 }
 
-int stop_on_signal(void*) { return pending_signal() != 0; }
+int stop_waiting(void*) { return is_stopping(); }
 
 void copy_display_matrix(const AVStream& from, AVStream* to) {
   const int32_t* matrix = display_matrix(from);
@@ -171,7 +171,7 @@ void VideoWriter::add_video_stream(const Reader& reader) {
 }
 
 void VideoWriter::open_file(const std::string& url) {
-  const AVIOInterruptCB interrupt = {stop_on_signal, nullptr};
+  const AVIOInterruptCB interrupt = {stop_waiting, nullptr};
   container_->interrupt_callback = interrupt;
   check(avio_open2(&container_->pb, url.c_str(), AVIO_FLAG_WRITE, &interrupt, nullptr),
         "cannot open the output");
