@@ -11,6 +11,7 @@
 #include "media/transparency.h"
 #include "media/writer_picture.h"
 #include "output_file.h"
+#include "progress.h"
 
 namespace dehaze {
 namespace {
@@ -46,14 +47,18 @@ Bytes exif_for(const Reader& reader, const AVFrame& picture, OutputKind kind, Co
 }  // namespace
 
 Outcome dehaze_picture(Reader& reader, const Options& options, Console& console) {
+  StepProgress progress(console, 4);
+  progress.begin("reading");
   const FramePtr frame = make_frame();
   if (!reader.read_frame(frame.get())) throw Error(reader.path() + ": holds no picture");
 
   const Orientation orientation = orientation_of(reader, *frame);
   FramePath path(*frame, reader.is_picture(), 0, options.engine, console);
   const FrameSize& size = path.size();
+  progress.begin("taking the haze out");
   const Nv21Frame& nv21 = path.run(*frame);
 
+  progress.begin("converting the result");
   OutputSamples samples = picture_samples(options.output_kind, path.siting());
   // Turning a 4:2:0 picture of an odd size would put its chroma half a sample off.
   if (samples.format == AV_PIX_FMT_YUVJ420P && size.is_padded() && !orientation.is_upright()) {
@@ -73,6 +78,7 @@ Outcome dehaze_picture(Reader& reader, const Options& options, Console& console)
   const Bytes exif = exif_for(reader, *picture, options.output_kind, console);
 
   throw_if_interrupted();
+  progress.begin("writing");
   OutputFile file(options.output, options.force);
   write_picture(*picture, options.output_kind, file.temporary_path(), exif);
   throw_if_interrupted();

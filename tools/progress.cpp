@@ -32,6 +32,14 @@ void Progress::advance() {
   console_.show_progress({share, progress_text(unit_, done_, total, seconds)});
 }
 
+void StepProgress::begin(const std::string& what) {
+  const double share = static_cast<double>(begun_) / steps_;
+  ++begun_;
+  if (!console_.shows_progress()) return;
+  console_.show_progress(
+      {share, "step " + std::to_string(begun_) + "/" + std::to_string(steps_) + ": " + what});
+}
+
 std::string progress_text(const std::string& unit, int64_t done, int64_t total, double seconds) {
   const double speed = seconds > 0 ? static_cast<double>(done) / seconds : 0;
   char text[160];

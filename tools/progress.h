@@ -29,6 +29,20 @@ class Progress {
   Clock::time_point last_shown_;
 };
 
+// Progress of a picture: which step of how many.
+class StepProgress {
+ public:
+  StepProgress(Console& console, int steps) : console_(console), steps_(steps) {}
+
+  // "step 2/4: taking the haze out"
+  void begin(const std::string& what);
+
+ private:
+  Console& console_;
+  int steps_;
+  int begun_ = 0;
+};
+
 // "120/300 frames, 40 %, 58.3 frames/s, 0:03 left"; without a total "120 frames, 58.3 frames/s".
 std::string progress_text(const std::string& unit, int64_t done, int64_t total, double seconds);
 

@@ -83,6 +83,18 @@ case_progress_on_terminal() {
   ! grep -aq 'frames/s' quiet_typescript || fail "progress in spite of --quiet"
 }
 
+case_progress_of_a_picture() {
+  command -v script >/dev/null || skip "script(1) is not installed"
+  make_picture in.png 640x480
+  script -qec "$DEHAZE in.png out.png" typescript >/dev/null </dev/null
+  local step
+  for step in '1/4: reading' '2/4: taking the haze out' '4/4: writing'; do
+    grep -aq "step $step" typescript || fail "no step $step in: $(cat -v typescript)"
+  done
+  dehaze --force in.png out.png
+  says_nothing
+}
+
 case_timing() {
   make_video in.mp4 160x160 0.2
   dehaze --timing --quiet in.mp4 out.mp4
