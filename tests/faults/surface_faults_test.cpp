@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "tests/faults/fault_points.h"
+#include "tests/support/effort.h"
 #include "tests/surface/blocks.h"
 
 namespace haze::test {
@@ -17,7 +18,7 @@ namespace {
 // HAZE_TEST_FAULT_CALLS sets another number of drawn calls for each block.
 int calls_per_block() {
   const char* const text = std::getenv("HAZE_TEST_FAULT_CALLS");
-  return text != nullptr ? std::atoi(text) : 12;
+  return text != nullptr ? std::atoi(text) : effort(12, 2);
 }
 
 std::vector<uint8_t> draw_choices(Random& random) {

@@ -4,12 +4,13 @@
 #include <cstdint>
 #include <vector>
 
+#include "tests/support/effort.h"
 #include "tests/surface/blocks.h"
 
 namespace haze::test {
 namespace {
 
-constexpr int kCallsPerBlock = 60;
+constexpr int kCallsPerBlock = effort(60, 4);
 
 std::vector<uint8_t> draw_choices(Random& random) {
   std::vector<uint8_t> bytes(static_cast<size_t>(random.between(4, 300)));

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "haze_preview.h"
+#include "tests/support/effort.h"
 #include "tests/support/moods.h"
 #include "tests/support/session_pair.h"
 #include "tests/surface/blocks.h"
@@ -16,7 +17,7 @@ namespace haze::test {
 namespace {
 
 constexpr int kCallers = 8;
-constexpr int kRounds = 6;
+constexpr int kRounds = effort(6, 1);
 
 std::vector<uint8_t> draw_choices(Random& random) {
   std::vector<uint8_t> bytes(100);
@@ -70,7 +71,7 @@ TEST(Callers, EightOfAnyReentrantBlocks) {
   std::vector<Block> blocks;
   for (const Block& block : all_blocks())
     if (block.beside == Beside::kAny) blocks.push_back(block);
-  for (int round = 0; round < 40 && !HasFailure(); ++round) {
+  for (int round = 0; round < effort(40, 4) && !HasFailure(); ++round) {
     Calls calls;
     for (int lane = 0; lane < kCallers; ++lane) {
       const std::vector<uint8_t> bytes = draw_choices(random);
