@@ -8,6 +8,7 @@
 #include "core/cpu_level.h"
 #include "core/numeric.h"
 #include "core/target.h"
+#include "filter/box_integer_neon.h"
 #include "filter/box_prefix.h"
 
 namespace haze::filter {
@@ -21,13 +22,21 @@ inline void start_columns(Sum* sums, const uint8_t* row, int width) {
 // sums[x] += row[x]: a row enters the window.
 template <typename Sum>
 inline void add_row(Sum* sums, const uint8_t* row, int width) {
-  for (int x = 0; x < width; ++x) sums[x] = static_cast<Sum>(sums[x] + row[x]);
+  int x = 0;
+#if HAZE_NEON
+  x = add_row_neon(sums, row, width);
+#endif
+  for (; x < width; ++x) sums[x] = static_cast<Sum>(sums[x] + row[x]);
 }
 
 // sums[x] -= row[x]: a row leaves it.
 template <typename Sum>
 inline void subtract_row(Sum* sums, const uint8_t* row, int width) {
-  for (int x = 0; x < width; ++x) sums[x] = static_cast<Sum>(sums[x] - row[x]);
+  int x = 0;
+#if HAZE_NEON
+  x = subtract_row_neon(sums, row, width);
+#endif
+  for (; x < width; ++x) sums[x] = static_cast<Sum>(sums[x] - row[x]);
 }
 
 // A row enters and another leaves, columns [begin, end).
@@ -37,89 +46,6 @@ inline void slide_rows_portable(Sum* sums, const uint8_t* entering, const uint8_
   for (int x = begin; x < end; ++x)
     sums[x] = static_cast<Sum>(sums[x] + (entering[x] - leaving[x]));
 }
-
-#if HAZE_NEON
-// Same sums, sixteen columns a step; returns the first column that it did not touch. Whole registers
-// are loaded because Clang takes eight-byte loads that are widened through the stack.
-inline int slide_rows_neon(int16_t* sums, const uint8_t* entering, const uint8_t* leaving,
-                           int width) {
-  int x = 0;
-  for (; x + 16 <= width; x += 16) {
-    const uint8x16_t more = vld1q_u8(entering + x);
-    const uint8x16_t less = vld1q_u8(leaving + x);
-    // The difference wraps as unsigned and reads back as signed.
-    const int16x8_t low = vreinterpretq_s16_u16(vsubl_u8(vget_low_u8(more), vget_low_u8(less)));
-    const int16x8_t high = vreinterpretq_s16_u16(vsubl_u8(vget_high_u8(more), vget_high_u8(less)));
-    vst1q_s16(sums + x, vaddq_s16(vld1q_s16(sums + x), low));
-    vst1q_s16(sums + x + 8, vaddq_s16(vld1q_s16(sums + x + 8), high));
-  }
-  return x;
-}
-
-// Sums of four windows: those of the window before, in the last lane of `before`, and the changes
-// from one to the next.
-inline int32x4_t running_sums_neon(int32x4_t before, int32x4_t changes) {
-  const int32x4_t zero = vdupq_n_s32(0);
-  changes = vaddq_s32(changes, vextq_s32(zero, changes, 3));
-  changes = vaddq_s32(changes, vextq_s32(zero, changes, 2));
-  return vaddq_s32(changes, vdupq_lane_s32(vget_high_s32(before), 1));
-}
-
-// Means of windows of 64 columns and 32 ... 64 rows, by reciprocal.
-//
-// With v = sum / 64 <= 255 * rows, truncated, the mean is v / rows. vqrdmulh and the shift give
-// (v * m + 2^14) >> 20, where m = (2^20 - e) / rows and 1 <= e <= rows: v / rows, less at most
-// 255 * 64 / 2^20 < 1 / 64 (and not equal unless v = 0), plus 1 / 64. That never falls below
-// v / rows, and stays below the next integer, which is 1 / rows >= 1 / 64 away at least.
-inline int16x8_t reciprocal_of_rows(int rows) {
-  return vdupq_n_s16(static_cast<int16_t>(((1 << 20) - 1) / rows));
-}
-inline uint8x8_t means_64_neon(int32x4_t low, int32x4_t high, int16x8_t reciprocal) {
-  const int16x8_t v = vcombine_s16(vshrn_n_s32(low, 6), vshrn_n_s32(high, 6));
-  return vshrn_n_u16(vreinterpretq_u16_s16(vqrdmulhq_s16(v, reciprocal)), 5);
-}
-
-// Means of windows of 64 columns that move on by one column per pixel, 32 pixels a step: `sum` is
-// the window's before the first of them; entering[x] and leaving[x] are the column sums that pixel x
-// adds and drops. Returns the first pixel that it did not write, and leaves the sum of the pixel
-// before it.
-//
-// The loads deal four neighbouring pixels out to four vectors, so that seven of eight additions of
-// the running sum go side by side: lane l of vector k is pixel 4 l + k.
-inline int mean_windows_64_neon(const int16_t* entering, const int16_t* leaving, uint8_t* dst,
-                                int pixels, int32_t& sum, int rows) {
-  const int16x8_t reciprocal = reciprocal_of_rows(rows);
-  int32x4_t last = vdupq_n_s32(sum);
-  int x = 0;
-  for (; x + 32 <= pixels; x += 32) {
-    const int16x8x4_t more = vld4q_s16(entering + x);
-    const int16x8x4_t less = vld4q_s16(leaving + x);
-    // Range: columns sum to 0 ... 16,320, so two changes stay within +-32,640.
-    const int16x8_t c0 = vsubq_s16(more.val[0], less.val[0]);
-    const int16x8_t c1 = vaddq_s16(c0, vsubq_s16(more.val[1], less.val[1]));
-    const int16x8_t c2 = vsubq_s16(more.val[2], less.val[2]);
-    const int16x8_t c3 = vaddq_s16(c2, vsubq_s16(more.val[3], less.val[3]));
-    // Sums of every fourth window, and of the ones before the groups of four.
-    const int32x4_t low = running_sums_neon(last, vaddl_s16(vget_low_s16(c1), vget_low_s16(c3)));
-    const int32x4_t high = running_sums_neon(low, vaddl_s16(vget_high_s16(c1), vget_high_s16(c3)));
-    const int32x4_t low_before = vextq_s32(last, low, 3);
-    const int32x4_t high_before = vextq_s32(low, high, 3);
-    const int32x4_t low1 = vaddw_s16(low_before, vget_low_s16(c1));
-    const int32x4_t high1 = vaddw_s16(high_before, vget_high_s16(c1));
-    uint8x8x4_t means;  // filled one by one: GCC takes a whole initialiser through the stack
-    means.val[0] = means_64_neon(vaddw_s16(low_before, vget_low_s16(c0)),
-                                 vaddw_s16(high_before, vget_high_s16(c0)), reciprocal);
-    means.val[1] = means_64_neon(low1, high1, reciprocal);
-    means.val[2] = means_64_neon(vaddw_s16(low1, vget_low_s16(c2)),
-                                 vaddw_s16(high1, vget_high_s16(c2)), reciprocal);
-    means.val[3] = means_64_neon(low, high, reciprocal);
-    vst4_u8(dst + x, means);
-    last = high;
-  }
-  sum = vgetq_lane_s32(last, 3);
-  return x;
-}
-#endif
 
 #if HAZE_X86
 // Same sums; each returns the first column that it did not touch.
@@ -132,7 +58,11 @@ void mean_row_avx512(PrefixRow& row, int rows);
 #endif
 
 inline void slide_rows(int32_t* sums, const uint8_t* entering, const uint8_t* leaving, int width) {
-  slide_rows_portable(sums, entering, leaving, 0, width);
+  int x = 0;
+#if HAZE_NEON
+  x = slide_rows_neon(sums, entering, leaving, width);
+#endif
+  slide_rows_portable(sums, entering, leaving, x, width);
 }
 
 inline void slide_rows(int16_t* sums, const uint8_t* entering, const uint8_t* leaving, int width) {
@@ -155,9 +85,14 @@ inline int mean_windows(const Sum*, const Sum*, uint8_t*, int, RowSum&, int) {
 
 #if HAZE_NEON
 inline int mean_windows(const int16_t* entering, const int16_t* leaving, uint8_t* dst, int pixels,
-                        int32_t& sum, int rows) {
+                        int32_t& sum, int count) {
   // 16 bits hold the column sums of the 64 x 64 mean alone.
-  return mean_windows_64_neon(entering, leaving, dst, pixels, sum, rows);
+  return mean_windows_64_neon(entering, leaving, dst, pixels, sum, count / 64);
+}
+
+inline int mean_windows(const int32_t* entering, const int32_t* leaving, uint8_t* dst, int pixels,
+                        int32_t& sum, int count) {
+  return mean_windows_32_neon(entering, leaving, dst, pixels, sum, count);
 }
 #endif
 
@@ -178,7 +113,7 @@ inline void mean_row(const Sum* sums, uint8_t* dst, int width, Reach reach, int 
     dst[x] = divide(sum, rows, reach.after + 1 + x);
   }
   const int right = width - reach.after;
-  x += mean_windows(entering + x, leaving + x, dst + x, right - x, sum, rows);
+  x += mean_windows(entering + x, leaving + x, dst + x, right - x, sum, rows * window);
   for (; x < right; ++x) {
     sum += entering[x];
     sum -= leaving[x];
