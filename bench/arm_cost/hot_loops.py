@@ -61,7 +61,17 @@ def backward_target(address, instruction):
 
 
 def hot_loops(counts, code):
-    """(instructions, executions) of each loop."""
+    """(instructions, executions) of each loop; of loops in one another the larger one."""
+    found = sorted(candidates(counts, code), key=lambda loop: -len(loop[0]))
+    taken = set()
+    for body, often in found:
+        addresses = {address for address, _ in body}
+        if not addresses & taken:
+            taken |= addresses
+            yield [text for _, text in body], often
+
+
+def candidates(counts, code):
     index = {address: i for i, (address, _) in enumerate(code)}
     least = LEAST_SHARE * sum(counts.values())
     for i, (address, instruction) in enumerate(code):
@@ -73,7 +83,7 @@ def hot_loops(counts, code):
         # A loop that is entered or left in its middle has slightly different counts.
         if often * len(body) >= least and all(
                 abs(counts.get(a, 0) - often) <= 0.1 * often for a, _ in body):
-            yield [text for _, text in body], often
+            yield body, often
 
 
 def for_model(instructions):
@@ -90,11 +100,14 @@ def for_model(instructions):
             conditional -= 1
             text = re.sub(r"^(\w+?)(eq|ne|cs|hs|cc|lo|mi|pl|vs|vc|hi|ls|ge|lt|gt|le)(?=[\s.])",
                           r"\1", text)
-        one = re.match(r"v(ld|st)mia\s+(\w+)!, \{(\w+)\}", text)
+        # Loads and stores of several registers have no entry either.
+        one = re.match(r"v(ld|st)mia\s+(\w+)!, \{(s\d+)\}", text)
         if one:
             yield f"v{one.group(1)}r {one.group(3)}, [{one.group(2)}]"
             yield f"add {one.group(2)}, #4"
             continue
+        text = re.sub(r"^v(ld|st)mia\s+(\w+), (\{d\d+(?:, d\d+){0,3}\})", r"v\g<1>1.64 \3, [\2]",
+                      text)
         yield re.sub(r"^vswp\s", "vtrn.32 ", text)  # no entry either; as wide a permutation
 
 
@@ -129,11 +142,11 @@ def main():
     counts = {a: (n - once.get(a, 0)) / 2 for a, n in thrice.items() if n > once.get(a, 0)}
     instructions = cycles = stores = 0
     for body, often in hot_loops(counts, list(disassembly(program))):
+        stores += often * stack_stores(body)
         each = model_cycles(body, cpu)
         if each is not None:
             instructions += often * len(body)
             cycles += often * each
-            stores += often * stack_stores(body)
     share = round(100 * instructions / sum(counts.values()))
     print(f"{share} {cycles / int(pixels):.2f} {stores / int(pixels):.2f}")
 
