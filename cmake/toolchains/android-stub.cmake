@@ -17,11 +17,15 @@ if(HAZE_PREVIEW_ANDROID_ABI STREQUAL "armeabi-v7a")
   set(CMAKE_CXX_COMPILER_TARGET armv7a-linux-androideabi21)
   set(target_flags "-march=armv7-a -mthumb")
   set(headers arm-linux-gnueabi)
+  # ARMv7-A divides no integers: the helpers come with the compiler, from the NDK's built-ins there
+  # and from GCC's here.
+  set(compiler_helpers "/usr/lib/gcc-cross/arm-linux-gnueabi/12/libgcc.a")
 else()
   set(CMAKE_SYSTEM_PROCESSOR aarch64)
   set(CMAKE_CXX_COMPILER_TARGET aarch64-linux-android21)
   set(target_flags "")
   set(headers aarch64-linux-gnu)
+  set(compiler_helpers "")
 endif()
 # The flags that the NDK adds for a release.
 set(CMAKE_CXX_FLAGS_INIT "${target_flags} -fstack-protector-strong -ffunction-sections \
@@ -30,4 +34,4 @@ set(CMAKE_CXX_FLAGS_INIT "${target_flags} -fstack-protector-strong -ffunction-se
 set(CMAKE_SHARED_LINKER_FLAGS_INIT "-fuse-ld=lld -nostdlib -L${HAZE_PREVIEW_ANDROID_STUBS} \
 -Wl,--no-undefined -Wl,--no-undefined-version -Wl,--fatal-warnings -Wl,-z,text -Wl,--gc-sections \
 -Wl,--no-rosegment -Wl,--hash-style=both -Wl,--build-id=sha1")
-set(CMAKE_CXX_STANDARD_LIBRARIES "-lc -lm")
+set(CMAKE_CXX_STANDARD_LIBRARIES "-lc -lm ${compiler_helpers}")

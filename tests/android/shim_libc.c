@@ -1,6 +1,7 @@
 // A libc.so by Android's names for a library that was linked for Android, on top of glibc: lets it
 // run under an emulator without Android. Both pass floats in core registers.
 #include <pthread.h>
+#include <signal.h>
 #include <stddef.h>
 #include <stdint.h>
 #include <stdlib.h>
@@ -22,6 +23,8 @@ FORWARD(int, pthread_create,
         (pthread_t* thread, const pthread_attr_t* attributes, void* (*start)(void*), void* argument),
         (thread, attributes, start, argument));
 FORWARD(int, pthread_join, (pthread_t thread, void** value), (thread, value));
+
+FORWARD(int, raise, (int signal_number), (signal_number));
 
 void shim_free(void* block) { free(block); }
 EXPORT(free);
