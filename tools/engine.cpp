@@ -41,7 +41,7 @@ FrameSize engine_frame_size(EngineKind kind, int width, int height) {
 std::unique_ptr<Engine> make_engine(EngineKind kind, const EngineOptions& options, int width,
                                     int height, double frames_per_second, Console& console) {
   if (kind == EngineKind::kPreview) {
-    return std::make_unique<PreviewEngine>(width, height, options, console);
+    return std::make_unique<PreviewEngine>(width, height, options, frames_per_second, console);
   }
   return std::make_unique<PhotoEngine>(options.strength, frames_per_second);
 }

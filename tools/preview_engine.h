@@ -2,14 +2,19 @@
 #ifndef TOOLS_PREVIEW_ENGINE_H
 #define TOOLS_PREVIEW_ENGINE_H
 
+#include <optional>
+
 #include "console.h"
 #include "engine.h"
+#include "photo/haze_judge.h"
 
 namespace dehaze {
 
 class PreviewEngine : public Engine {
  public:
-  PreviewEngine(int width, int height, const EngineOptions& options, Console& console);
+  // frames_per_second: 0 for pictures or if unknown.
+  PreviewEngine(int width, int height, const EngineOptions& options, double frames_per_second,
+                Console& console);
   ~PreviewEngine() override;
 
   void process(Nv21Frame& frame) override;
@@ -17,9 +22,13 @@ class PreviewEngine : public Engine {
   std::vector<float> transmission() const override;
 
  private:
+  void judge(Nv21Frame& frame);
+
   int width_;
   int height_;
   int level_;
+  std::optional<HazeJudge> judge_;  // sets the level while there is one
+  int frames_to_judge_ = 0;
 };
 
 }  // namespace dehaze
