@@ -20,7 +20,7 @@ using test::SessionPair;
 using test::Size;
 
 constexpr int kMostSteps = 12;
-constexpr int kMostBlockBytes = 32 << 20;
+constexpr int kMostBlockBytes = 4 << 20;
 
 int draw_format(Choices& choices) {
   const int formats[] = {0, 3, 3, 1, 2, 4, -1, INT_MAX, INT_MIN};
@@ -94,7 +94,7 @@ void run_step(Choices& choices, SessionPair& sessions) {
       return sessions.set_frame_number(choices.one_of(numbers));
     }
     case 4:
-      if (sessions.reference().open) return;
+      if (sessions.reference().open || !choices.one_in(8)) return;
       return sessions.supply_block(std::vector<uint8_t>(1280 * 720 * 4, choices.byte()));
     default:
       return run_frame(choices, sessions);

@@ -6,7 +6,9 @@
 #include <errno.h>
 #include <pthread.h>
 #include <stddef.h>
+#include <stdint.h>
 #include <stdlib.h>
+#include <string.h>
 
 #include <atomic>
 
@@ -28,36 +30,61 @@ std::atomic<bool> armed;
 std::atomic<int> allocations;
 std::atomic<int> threads;
 std::atomic<int> unjoined;
-// Blocks that were handed out while armed.
-std::atomic<void*> blocks[kMostBlocks];
+std::atomic<int> overrun;
 Failing failing_allocations;
 Failing failing_threads;
 thread_local bool starting_thread;
 
-void remember(void* block) {
-  for (std::atomic<void*>& entry : blocks) {
+// A block that was handed out while armed, with a canary behind it.
+struct Block {
+  std::atomic<void*> address;
+  std::atomic<size_t> size;
+};
+Block blocks[kMostBlocks];
+constexpr size_t kCanaryBytes = 16;
+constexpr unsigned char kCanary = 0xC7;
+
+unsigned char* canary_of(void* block, size_t size) {
+  return static_cast<unsigned char*>(block) + size;
+}
+
+void remember(void* block, size_t size) {
+  memset(canary_of(block, size), kCanary, kCanaryBytes);
+  for (Block& entry : blocks) {
     void* none = nullptr;
-    if (entry.compare_exchange_strong(none, block)) return;
+    if (!entry.address.compare_exchange_strong(none, block)) continue;
+    entry.size = size;
+    return;
   }
   abort();
 }
 
 void forget(void* block) {
-  for (std::atomic<void*>& entry : blocks) {
+  for (Block& entry : blocks) {
+    const size_t size = entry.size;
     void* expected = block;
-    if (entry.compare_exchange_strong(expected, nullptr)) return;
+    if (!entry.address.compare_exchange_strong(expected, nullptr)) continue;
+    const unsigned char* const canary = canary_of(block, size);
+    for (size_t i = 0; i < kCanaryBytes; ++i)
+      if (canary[i] != kCanary) {
+        ++overrun;
+        return;
+      }
+    return;
   }
 }
 
+// `allocate` is given the number of bytes to ask for.
 template <class Allocate>
-void* counted(const Allocate& allocate) {
-  if (!armed || starting_thread) return allocate();
+void* counted(size_t size, const Allocate& allocate) {
+  if (!armed || starting_thread) return allocate(size);
   if (failing_allocations.hits(allocations++)) {
     errno = ENOMEM;
     return nullptr;
   }
-  void* const block = allocate();
-  if (block != nullptr) remember(block);
+  if (size > SIZE_MAX - kCanaryBytes) return nullptr;
+  void* const block = allocate(size + kCanaryBytes);
+  if (block != nullptr) remember(block, size);
   return block;
 }
 
@@ -71,15 +98,15 @@ Function real(const char* name) {
 void arm_faults(Failing failing_allocation_calls, Failing failing_thread_calls) {
   failing_allocations = failing_allocation_calls;
   failing_threads = failing_thread_calls;
-  allocations = threads = unjoined = 0;
-  for (std::atomic<void*>& entry : blocks) entry = nullptr;
+  allocations = threads = unjoined = overrun = 0;
+  for (Block& entry : blocks) entry.address = nullptr;
   armed = true;
 }
 
 FaultCounts disarm_faults() {
   armed = false;
-  FaultCounts counts = {allocations, 0, threads, unjoined};
-  for (const std::atomic<void*>& entry : blocks) counts.live += entry != nullptr;
+  FaultCounts counts = {allocations, 0, overrun, threads, unjoined};
+  for (const Block& entry : blocks) counts.live += entry.address != nullptr;
   return counts;
 }
 
@@ -88,22 +115,23 @@ FaultCounts disarm_faults() {
 extern "C" {
 
 void* malloc(size_t size) {
-  return haze::test::counted([=] { return __libc_malloc(size); });
+  return haze::test::counted(size, [](size_t bytes) { return __libc_malloc(bytes); });
 }
 
 void* calloc(size_t count, size_t size) {
-  return haze::test::counted([=] { return __libc_calloc(count, size); });
+  if (size != 0 && count > SIZE_MAX / size) return nullptr;
+  return haze::test::counted(count * size, [](size_t bytes) { return __libc_calloc(bytes, 1); });
 }
 
 void* realloc(void* block, size_t size) {
-  return haze::test::counted([=] {
+  return haze::test::counted(size, [=](size_t bytes) {
     haze::test::forget(block);
-    return __libc_realloc(block, size);
+    return __libc_realloc(block, bytes);
   });
 }
 
 void* memalign(size_t alignment, size_t size) {
-  return haze::test::counted([=] { return __libc_memalign(alignment, size); });
+  return haze::test::counted(size, [=](size_t bytes) { return __libc_memalign(alignment, bytes); });
 }
 
 void* aligned_alloc(size_t alignment, size_t size) { return memalign(alignment, size); }

@@ -18,6 +18,7 @@ struct Failing {
 struct FaultCounts {
   int allocations;  // calls that ask for memory
   int live;         // blocks that are not given back yet
+  int overrun;      // blocks that were written past their end
   int threads;      // calls of pthread_create
   int unjoined;     // threads that have started and are not joined
 };

@@ -40,6 +40,7 @@ FaultCounts run_with_faults(const Block& block, const std::vector<uint8_t>& byte
   call.run();
   const FaultCounts counts = disarm_faults();
   EXPECT_EQ(counts.live, 0) << "memory that was not given back";
+  EXPECT_EQ(counts.overrun, 0) << "memory of its own that was written past its end";
   EXPECT_EQ(counts.unjoined, 0) << "threads that were not joined";
   if (promise == Promise::kResult || !call.untouched()) {
     EXPECT_EQ(call.difference(), "");
