@@ -14,17 +14,17 @@ namespace {
 namespace fs = std::filesystem;
 
 const std::set<std::string>& readable_pictures() {
-  static const std::set<std::string> kExtensions = {
-      ".avif", ".bmp", ".dib", ".dpx", ".exr", ".hdr", ".j2k", ".jp2", ".jxl", ".pam", ".pbm",
-      ".pcx",  ".pgm", ".pnm", ".ppm", ".psd", ".qoi", ".sgi", ".tga", ".tif", ".tiff"};
+  static const std::set<std::string> kExtensions = {".bmp", ".dib", ".dpx", ".exr", ".j2k", ".jp2",
+                                                    ".jxl", ".pbm", ".pcx", ".pgm", ".pnm", ".ppm",
+                                                    ".psd", ".qoi", ".sgi", ".tif", ".tiff"};
   return kExtensions;
 }
 
 const std::set<std::string>& readable_videos() {
   static const std::set<std::string> kExtensions = {
-      ".264",  ".265",  ".3g2", ".3gp",  ".asf", ".avi",   ".dv",   ".flv",
-      ".h264", ".hevc", ".ivf", ".m2ts", ".m2v", ".mjpeg", ".mpeg", ".mpg",
-      ".mts",  ".mxf",  ".nut", ".ogv",  ".ts",  ".vob",   ".webm", ".wmv"};
+      ".264",  ".265",  ".3g2", ".3gp",  ".asf", ".avi",  ".dv",  ".flv",
+      ".h264", ".hevc", ".ivf", ".m2ts", ".m2v", ".mpeg", ".mpg", ".mts",
+      ".mxf",  ".nut",  ".ogv", ".ts",   ".vob", ".webm", ".wmv"};
   return kExtensions;
 }
 

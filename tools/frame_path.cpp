@@ -18,7 +18,15 @@ void note_losses(const AVFrame& frame, const FrameSize& size, Console& console) 
                  std::to_string(kMaxFrameHeight) + "; --engine photo keeps the size)");
   }
   const int bits = bits_per_sample(static_cast<AVPixelFormat>(frame.format));
-  if (bits > 8) console.note(std::to_string(bits) + "-bit input is converted to 8 bits");
+  if (is_floating_point(static_cast<AVPixelFormat>(frame.format))) {
+    console.note("floating-point input is cut off at 1 and converted to 8 bits as it is");
+  } else if (bits > 8) {
+    console.note(std::to_string(bits) + "-bit input is converted to 8 bits");
+  }
+  if (frame.color_trc == AVCOL_TRC_SMPTE2084 || frame.color_trc == AVCOL_TRC_ARIB_STD_B67) {
+    console.note(
+        "HDR values stay as they are, in 8 bits; for ordinary screens convert it to SDR first");
+  }
   if (frame.interlaced_frame) {
     console.note("interlaced video is treated as progressive; deinterlace it first if it combs");
   }

@@ -110,6 +110,41 @@ case_signals() {
   run_and_signal HUP 129
 }
 
+# Killed without a chance to clean up: nothing under the output's name, and the next run works.
+case_killed() {
+  make_input -f lavfi -i "$(source_video 640x480 20)" -pix_fmt yuv420p in.y4m
+  echo precious >old.mp4
+  local name process
+  for name in new old; do
+    "$DEHAZE" --force in.y4m $name.mp4 2>messages &
+    process=$!
+    for _ in $(seq 100); do
+      [ -n "$(find . -name ".$name.*.part.mp4" -size +0)" ] && break
+      sleep 0.05
+    done
+    kill -KILL $process
+    wait $process 2>/dev/null || true
+  done
+  [ ! -e new.mp4 ] || fail "a file that is not complete"
+  equal "$(cat old.mp4)" precious
+  dehaze --force --max-frames 5 in.y4m old.mp4
+  equal "$(frame_times old.mp4 | wc -l)" 5 frames
+}
+
+case_full_disk_for_a_folder() {
+  mkdir in disk
+  make_picture in/a.png 640x480
+  cp in/a.png in/b.png
+  mount -t tmpfs -o size=64k none disk 2>/dev/null || skip "a small file system cannot be mounted"
+  trap 'umount disk; rm -rf "$folder"' EXIT
+  local status=0
+  "$DEHAZE" in -o disk/out 2>messages || status=$?
+  equal $status 1 status
+  says 'No space left on device'
+  says '^dehaze: 0 done, 0 skipped because the output exists, 2 failed'
+  equal "$(find disk -type f)" "" "files left on the disk"
+}
+
 case_two_runs_side_by_side() {
   make_video in.mp4 320x240 1
   "$DEHAZE" in.mp4 out.mp4 2>first &

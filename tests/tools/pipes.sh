@@ -155,6 +155,35 @@ case_nobody_writes() {
   only_files pipe
 }
 
+# A stage that fails ends the others, also one that waits for more input.
+case_failure_while_the_input_waits() {
+  [ -c /dev/full ] || skip "there is no /dev/full"
+  make_y4m in.y4m 320x240 0.4 limited
+  mkfifo pipe
+  { cat in.y4m; sleep 30; } >pipe &
+  local writer=$! status=0
+  timeout 20 "$DEHAZE" - - <pipe >/dev/full 2>messages || status=$?
+  kill $writer 2>/dev/null || true
+  equal $status 1 status
+  says 'cannot write the output: No space left on device'
+}
+
+case_signal_while_the_output_waits() {
+  # Nobody reads on: the encoder waits in a write, the others behind it.
+  make_y4m in.y4m 640x480 2 limited
+  mkfifo pipe
+  sleep 30 <pipe &
+  local reader=$! status=0
+  env --default-signal=TERM "$DEHAZE" in.y4m - >pipe 2>messages &
+  local process=$!
+  sleep 1
+  kill -TERM $process
+  wait $process || status=$?
+  kill $reader
+  equal $status 143 status
+  says 'interrupted'
+}
+
 case_standard_output_is_full() {
   [ -c /dev/full ] || skip "there is no /dev/full"
   make_y4m in.y4m 320x240 0.4 limited

@@ -70,6 +70,15 @@ case_json_of_a_folder() {
 TEXT
 }
 
+case_results_cannot_be_written() {
+  [ -c /dev/full ] || skip "there is no /dev/full"
+  make_picture in.png 160x160
+  local status=0
+  "$DEHAZE" --json in.png out.png >/dev/full 2>messages || status=$?
+  equal $status 1 status
+  says 'cannot write to standard output: No space left on device'
+}
+
 case_closed_json_pipe_is_quiet() {
   mkdir in
   make_picture in/a.png 160x160

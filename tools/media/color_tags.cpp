@@ -75,6 +75,10 @@ int bits_per_sample(AVPixelFormat pixel_format) {
   return bits;
 }
 
+bool is_floating_point(AVPixelFormat pixel_format) {
+  return (av_pix_fmt_desc_get(pixel_format)->flags & AV_PIX_FMT_FLAG_FLOAT) != 0;
+}
+
 bool is_420(AVPixelFormat pixel_format) {
   const AVPixFmtDescriptor& format = *av_pix_fmt_desc_get(pixel_format);
   return format.log2_chroma_w == 1 && format.log2_chroma_h == 1;

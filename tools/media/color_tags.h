@@ -34,6 +34,8 @@ int bits_per_sample(AVPixelFormat format);
 
 bool is_420(AVPixelFormat format);
 
+bool is_floating_point(AVPixelFormat format);
+
 }  // namespace dehaze
 
 #endif  // TOOLS_MEDIA_COLOR_TAGS_H

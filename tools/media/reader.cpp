@@ -16,6 +16,7 @@ extern "C" {
 #include "interrupt.h"
 #include "media/av_error.h"
 #include "media/raw_frames.h"
+#include "media/unsupported.h"
 
 namespace dehaze {
 namespace {
@@ -51,6 +52,11 @@ void check_readable_file(const std::string& path) {
   if (S_ISREG(status.st_mode) && status.st_size == 0) throw Error(path + ": the file is empty");
 }
 
+void check_supported_kind(const std::string& path) {
+  const std::string kind = unsupported_kind(path);
+  if (!kind.empty()) throw Error(path + ": " + kind);
+}
+
 // True for containers whose header gives the true duration unless the file breaks off.
 bool declares_duration(const AVFormatContext& container) {
   return (is_format(*container.iformat, "mov") || is_format(*container.iformat, "matroska")) &&
@@ -66,6 +72,7 @@ Reader::Reader(const std::string& path, const std::optional<RawFormat>& raw)
     open("pipe:0");
   } else {
     check_readable_file(path);
+    if (!raw_) check_supported_kind(path);
     // The prefix keeps names with a colon from being taken for network addresses.
     open("file:" + path);
   }
@@ -131,8 +138,9 @@ void Reader::open_decoder() {
   check(avcodec_parameters_to_context(decoder_.get(), video_->codecpar), path_);
   decoder_->pkt_timebase = video_->time_base;
   decoder_->thread_count = 0;  // as many as there are processors
-  // Without it a picture file that breaks off decodes to a picture with a grey rest.
-  if (is_picture_) decoder_->err_recognition |= AV_EF_EXPLODE;
+  // Without it a picture file that breaks off decodes to a picture with a grey rest. The decoder of
+  // TIFF would take every unknown tag for damage.
+  if (is_picture_ && codec->id != AV_CODEC_ID_TIFF) decoder_->err_recognition |= AV_EF_EXPLODE;
   check(avcodec_open2(decoder_.get(), codec, nullptr), path_ + ": cannot decode " + codec->name);
 }
 
