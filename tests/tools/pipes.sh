@@ -158,9 +158,9 @@ case_nobody_writes() {
 # A stage that fails ends the others, also one that waits for more input.
 case_failure_while_the_input_waits() {
   [ -c /dev/full ] || skip "there is no /dev/full"
-  make_y4m in.y4m 320x240 0.4 limited
+  make_y4m in.y4m 320x240 0.12 limited
   mkfifo pipe
-  { cat in.y4m; sleep 30; } >pipe &
+  { cat in.y4m; exec sleep 30; } >pipe &
   local writer=$! status=0
   timeout 20 "$DEHAZE" - - <pipe >/dev/full 2>messages || status=$?
   kill $writer 2>/dev/null || true

@@ -255,6 +255,28 @@ case_max_frames() {
   cmp got want
 }
 
+# peak_kilobytes COMMAND...: the most memory that it had.
+peak_kilobytes() {
+  python3 - "$@" <<'PYTHON'
+import resource, subprocess, sys
+subprocess.run(sys.argv[1:], check=True)
+print(resource.getrusage(resource.RUSAGE_CHILDREN).ru_maxrss)
+PYTHON
+}
+
+case_memory_stays_flat() {
+  command -v python3 >/dev/null || skip "python3 is not installed"
+  [ -z "$SANITIZERS" ] || skip "sanitizers keep freed memory"
+  make_video short.mp4 320x240 4
+  make_input -stream_loop 14 -i short.mp4 -c copy in.mp4
+  local few many
+  few=$(peak_kilobytes "$DEHAZE" --quiet --max-frames 150 in.mp4 few.mkv)
+  many=$(peak_kilobytes "$DEHAZE" --quiet in.mp4 many.mkv)
+  equal "$(frame_times many.mkv | wc -l)" 1500 frames
+  # Ten times the frames; one of them has 115 kilobytes.
+  [ $((many - few)) -lt 8000 ] || fail "$few kilobytes for 150 frames, $many for 1500"
+}
+
 case_alternating_frames() {
   # Every second frame uses the estimate of the one before: a still scene gives two equal frames.
   make_picture in.png 320x240
