@@ -17,6 +17,9 @@ constexpr int kLightWindowPart = 40;
 // Steps of the dark channel in its histogram. The library averages over one bin; with single values
 // a sky with a gradient would give the colour of its brightest corner.
 constexpr int kDarkStep = 4;
+// Thick haze is far away, and the ground gets farther from row to row of the picture: at its lower
+// edge the dark channel counts this much less. Snow in front is brighter than most haze.
+constexpr double kBottomLoss = 0.4;
 
 constexpr int kGuidedWindowPart = 20;
 constexpr float kGuidedRegularization = 1e-3F;
@@ -33,6 +36,19 @@ constexpr float kBrightestResult = 250;
 
 int longer_side(const BgrImage& image) { return std::max(image.width, image.height); }
 int shorter_side(const BgrImage& image) { return std::min(image.width, image.height); }
+
+// As a part of the longer side; at least 1, and the window fits into the image.
+int window_radius(int width, int height, int part) {
+  const int largest = (std::min(width, height) - 1) / 2;
+  return std::max(1, std::min(std::max(width, height) / part, largest));
+}
+
+// How much a pixel looks like thick haze, by its dark channel and its height: `depth` goes from 0 to
+// 1 down the picture.
+uint8_t haze_score(int dark, double depth) {
+  const int score = static_cast<int>(dark * (1 - kBottomLoss * depth));
+  return static_cast<uint8_t>(score / kDarkStep * kDarkStep);
+}
 
 // Means of 2 x 2 pixels, rounded; the last column and row are repeated where there is no second one.
 BgrImage halved(const BgrImage& image) {
@@ -80,8 +96,7 @@ DarkShares dark_shares(BgrImage& image, Light light) {
 GuidedModel fit_to_guide(Plane& plane, Plane& guide) {
   const int w = plane.width;
   const int h = plane.height;
-  const int radius =
-      std::max(1, std::min({std::max(w, h) / kGuidedWindowPart, (w - 1) / 2, (h - 1) / 2}));
+  const int radius = window_radius(w, h, kGuidedWindowPart);
   Plane mean(w, h);
   Plane guide_mean(w, h);
   Plane slope(w, h);   // first the mean of the product
@@ -157,12 +172,12 @@ Light estimate_light(BgrImage& small) {
   std::vector<uint8_t> dark(pixels);
   std::vector<int> histogram(256);
   CalculateMinChannelPreview(small.bytes.data(), darkest.data(), w, h, 0);
-  CalculateDarkChannelPreview(darkest.data(), dark.data(), histogram.data(), w, h,
-                              longer_side(small) / kLightWindowPart);
+  const int radius = window_radius(w, h, kLightWindowPart);
+  CalculateDarkChannelPreview(darkest.data(), dark.data(), histogram.data(), w, h, radius);
   std::fill(histogram.begin(), histogram.end(), 0);
-  for (uint8_t& value : dark) {
-    value = static_cast<uint8_t>(value / kDarkStep * kDarkStep);
-    ++histogram[value];
+  for (size_t i = 0; i < pixels; ++i) {
+    dark[i] = haze_score(dark[i], static_cast<double>(i) / static_cast<double>(pixels));
+    ++histogram[dark[i]];
   }
   Light light;
   EstimateAPreview(dark.data(), small.bytes.data(), histogram.data(), light.data(), w, h);

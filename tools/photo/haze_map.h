@@ -26,7 +26,8 @@ BgrImage half_resolution(Nv21Frame& frame);
 // one direction are not halved any further.
 BgrImage reduced(const BgrImage& image);
 
-// Colour of the thickest haze: the mean over the brightest part of the dark channel.
+// Colour of the thickest haze: the mean over the brightest part of the dark channel, the upper part of
+// the picture coming first.
 Light estimate_light(BgrImage& small);
 
 // What the guided filter learns: around each pixel of the small picture the share of the haze is
