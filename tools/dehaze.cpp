@@ -14,6 +14,8 @@
 #include "options.h"
 #include "outcome.h"
 #include "print_line.h"
+#include "report/options.h"
+#include "report/run.h"
 #include "show.h"
 
 namespace dehaze {
@@ -44,6 +46,7 @@ int guarded_main(int argc, char** argv) {
   try {
     watch_signals();
     capture_av_log();
+    if (asks_for_report(argc, argv)) return run_report(argc - 1, argv + 1);
     const std::optional<Options> options = parse_options(argc, argv);
     if (!options) return kExitDone;
     return options->is_batch() ? run_batch(*options) : run_single(*options);

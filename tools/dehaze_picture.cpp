@@ -16,11 +16,6 @@
 namespace dehaze {
 namespace {
 
-Orientation orientation_of(const Reader& reader, const AVFrame& frame) {
-  const int32_t* matrix = display_matrix(reader.video());
-  return matrix != nullptr ? orientation_of_matrix(matrix) : orientation_of_picture(frame);
-}
-
 void copy_icc_profile(const AVFrame& from, AVFrame* to) {
   const AVFrameSideData* profile = av_frame_get_side_data(&from, AV_FRAME_DATA_ICC_PROFILE);
   if (profile == nullptr) return;
@@ -52,7 +47,7 @@ Outcome dehaze_picture(Reader& reader, const Options& options, Console& console)
   const FramePtr frame = make_frame();
   if (!reader.read_frame(frame.get())) throw Error(reader.path() + ": holds no picture");
 
-  const Orientation orientation = orientation_of(reader, *frame);
+  const Orientation orientation = orientation_of(reader.video(), *frame);
   FramePath path(*frame, reader.is_picture(), 0, options.engine, console);
   const FrameSize& size = path.size();
   progress.begin("taking the haze out");

@@ -59,6 +59,11 @@ Orientation orientation_of_picture(const AVFrame& frame) {
   return tag != nullptr ? orientation_of_exif(std::atoi(tag->value)) : Orientation();
 }
 
+Orientation orientation_of(const AVStream& stream, const AVFrame& frame) {
+  const int32_t* matrix = display_matrix(stream);
+  return matrix != nullptr ? orientation_of_matrix(matrix) : orientation_of_picture(frame);
+}
+
 const int32_t* display_matrix(const AVStream& stream) {
   size_t size = 0;
   const uint8_t* data = av_stream_get_side_data(&stream, AV_PKT_DATA_DISPLAYMATRIX, &size);

@@ -27,6 +27,9 @@ Orientation orientation_of_matrix(const int32_t* matrix);
 // Of a decoded picture: its display matrix, else the EXIF tag among its metadata.
 Orientation orientation_of_picture(const AVFrame& frame);
 
+// Of a frame: the display matrix of its stream, else as above.
+Orientation orientation_of(const AVStream& stream, const AVFrame& frame);
+
 // Display matrix of a stream, null if it has none.
 const int32_t* display_matrix(const AVStream& stream);
 
