@@ -2,8 +2,8 @@
 #
 # Options come from the program's own help, so that they are always those of the installed version.
 
-_dehaze_options() {
-  "$1" --help 2>/dev/null | grep -oE -- '(^|[ ,])--?[a-z][a-z-]*' | grep -oE -- '--?[a-z][a-z-]*' |
+_dehaze_options() { # PROGRAM [report]
+  "$@" --help 2>/dev/null | grep -oE -- '(^|[ ,])--?[a-z][a-z-]*' | grep -oE -- '--?[a-z][a-z-]*' |
     sort -u
 }
 
@@ -18,7 +18,14 @@ _dehaze() {
     --show) words='map compare light' ;;
     --raw-output) words='i420 yv12 nv12 nv21' ;;
   esac
-  if [ -z "$words" ] && [[ $word == -* ]]; then words=$(_dehaze_options "$1"); fi
+  local mode=()
+  [ "${COMP_WORDS[1]}" != report ] || mode=(report)
+  if [ -z "$words" ] && [[ $word == -* ]]; then words=$(_dehaze_options "$1" "${mode[@]}"); fi
+  if [ "$COMP_CWORD" -eq 1 ] && [ -n "$word" ] && [[ report == "$word"* ]]; then
+    mapfile -t COMPREPLY < <(compgen -W report; compgen -f -- "$word")
+    compopt -o filenames 2>/dev/null # only while completing; quotes names
+    return
+  fi
   [ -z "$words" ] || mapfile -t COMPREPLY < <(compgen -W "$words" -- "$word")
 }
 

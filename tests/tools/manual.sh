@@ -3,12 +3,14 @@
 source "$(dirname "$0")/lib.sh"
 
 # Long options, one per line.
-options_of_help() { "$DEHAZE" --help | grep -oE -- '--[a-z][a-z-]*' | sort -u; }
+options_of_help() { # [report]
+  "$DEHAZE" "$@" --help | grep -oE -- '--[a-z][a-z-]*' | sort -u
+}
 
 case_page_has_every_option() {
   sed -nE 's/^\.It (Fl [^ ]+ .*, )?Fl Fl ([a-z-]+).*/--\2/p' "$MANUAL" | sort -u >documented
   [ -s documented ] || fail "no options in the manual page"
-  options_of_help >offered
+  sort -u <(options_of_help) <(options_of_help report) >offered
   diff offered documented || fail "the help (<) and the manual page (>) differ"
 }
 
@@ -39,6 +41,12 @@ case_completion() {
   equal "$(completed --level '')" ""
   equal "$(completed --engine p | tr '\n' ' ')" "photo preview "
   equal "$(completed in.png)" ""
+  completed report in.png -- | sort -u >offered
+  options_of_help report >wanted
+  diff offered wanted || fail "the completion of report (<) and its help (>) differ"
+  touch readme.jpg
+  equal "$(completed re | tr '\n' ' ')" "report readme.jpg "
+  equal "$(completed in.png re)" ""
 }
 
 run_case "$1"
