@@ -48,7 +48,7 @@ Outcome dehaze_picture(Reader& reader, const Options& options, Console& console)
   if (!reader.read_frame(frame.get())) throw Error(reader.path() + ": holds no picture");
 
   const Orientation orientation = orientation_of(reader.video(), *frame);
-  FramePath path(*frame, reader.is_picture(), 0, options.engine, console);
+  FramePath path(*frame, source_of(reader, *frame), options.engine, console);
   const FrameSize& size = path.size();
   progress.begin("taking the haze out");
   const Nv21Frame& nv21 = path.run(*frame);

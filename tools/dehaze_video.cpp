@@ -168,7 +168,7 @@ Outcome dehaze_video(Reader& reader, const Options& options, Console& console) {
   FramePtr first = make_frame();
   if (!reader.read_frame(first.get())) throw Error(reader.path() + ": holds no video");
 
-  FramePath path(*first, false, frames_per_second(reader), options.engine, console);
+  FramePath path(*first, source_of(reader, *first), options.engine, console);
   note_what_is_lost(reader, path.size(), kind, console);
   const Orientation turn = turn_for(reader, kind);
   VideoFormat format = format_before_turn(reader, *first, path, kind);

@@ -39,11 +39,11 @@ FrameSize engine_frame_size(EngineKind kind, int width, int height) {
 }
 
 std::unique_ptr<Engine> make_engine(EngineKind kind, const EngineOptions& options, int width,
-                                    int height, double frames_per_second, Console& console) {
+                                    int height, const Source& source, Console& console) {
   if (kind == EngineKind::kPreview) {
-    return std::make_unique<PreviewEngine>(width, height, options, frames_per_second, console);
+    return std::make_unique<PreviewEngine>(width, height, options, source, console);
   }
-  return std::make_unique<PhotoEngine>(options.strength, frames_per_second);
+  return std::make_unique<PhotoEngine>(options.strength, source);
 }
 
 }  // namespace dehaze

@@ -12,6 +12,7 @@
 #include "engine_options.h"
 #include "media/frame_size.h"
 #include "media/nv21.h"
+#include "media/orientation.h"
 
 namespace dehaze {
 
@@ -39,6 +40,13 @@ struct RunReport {
   HazeFindings findings;
 };
 
+// Where the frames come from.
+struct Source {
+  bool is_picture = false;
+  double frames_per_second = 0;  // 0 for a picture or if unknown
+  Orientation orientation;       // of the frames as they are stored
+};
+
 class Engine {
  public:
   Engine() = default;
@@ -64,9 +72,9 @@ class Engine {
 // cannot take.
 FrameSize engine_frame_size(EngineKind kind, int width, int height);
 
-// kind: as chosen by choose_engine. frames_per_second: 0 for a picture or if unknown.
+// kind: as chosen by choose_engine.
 std::unique_ptr<Engine> make_engine(EngineKind kind, const EngineOptions& options, int width,
-                                    int height, double frames_per_second, Console& console);
+                                    int height, const Source& source, Console& console);
 
 }  // namespace dehaze
 

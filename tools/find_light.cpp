@@ -11,9 +11,9 @@ namespace dehaze {
 Outcome find_light(Reader& reader, const Options& options, Console& console) {
   const FramePtr frame = make_frame();
   if (!reader.read_frame(frame.get())) throw Error(reader.path() + ": holds no picture");
-  const double rate = reader.is_picture() ? 0 : frames_per_second(reader);
-  FramePath path(*frame, reader.is_picture(), rate, options.engine, console);
-  const int64_t first_second = std::max<int64_t>(1, std::llround(rate));
+  const Source source = source_of(reader, *frame);
+  FramePath path(*frame, source, options.engine, console);
+  const int64_t first_second = std::max<int64_t>(1, std::llround(source.frames_per_second));
   const int64_t limit = options.max_frames > 0 ? options.max_frames : first_second;
   int64_t frames = 0;
   do {

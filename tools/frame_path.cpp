@@ -39,20 +39,28 @@ double frames_per_second(const Reader& reader) {
   return rate.num > 0 && rate.den > 0 ? av_q2d(rate) : 0;
 }
 
-FramePath::FramePath(const AVFrame& first, bool is_picture, double frames_per_second,
-                     const EngineOptions& options, Console& console)
-    : FramePath(choose_engine(options, first.width, first.height, is_picture), first, is_picture,
-                frames_per_second, options, console) {}
+Source source_of(const Reader& reader, const AVFrame& first) {
+  Source source;
+  source.is_picture = reader.is_picture();
+  source.frames_per_second = reader.is_picture() ? 0 : frames_per_second(reader);
+  source.orientation = orientation_of(reader.video(), first);
+  return source;
+}
 
-FramePath::FramePath(EngineKind kind, const AVFrame& first, bool is_picture,
-                     double frames_per_second, const EngineOptions& options, Console& console)
+FramePath::FramePath(const AVFrame& first, const Source& source, const EngineOptions& options,
+                     Console& console)
+    : FramePath(choose_engine(options, first.width, first.height, source.is_picture), first, source,
+                options, console) {}
+
+FramePath::FramePath(EngineKind kind, const AVFrame& first, const Source& source,
+                     const EngineOptions& options, Console& console)
     : size_(engine_frame_size(kind, first.width, first.height)),
-      siting_(meaning_of(first, is_picture).siting),
+      siting_(meaning_of(first, source.is_picture).siting),
       show_(options.show),
       console_(console),
-      to_nv21_(size_, is_picture, siting_),
-      engine_(make_engine(kind, options, size_.padded_width(), size_.padded_height(),
-                          frames_per_second, console)),
+      to_nv21_(size_, source.is_picture, siting_),
+      engine_(
+          make_engine(kind, options, size_.padded_width(), size_.padded_height(), source, console)),
       nv21_(size_.padded_width(), size_.padded_height()) {
   note_losses(first, size_, console);
 }

@@ -17,12 +17,14 @@ namespace dehaze {
 // Of a video; 0 if unknown.
 double frames_per_second(const Reader& reader);
 
+Source source_of(const Reader& reader, const AVFrame& first);
+
 class FramePath {
  public:
   // The first frame decides on the engine and on the size that all frames are brought to. Notes
-  // what is lost on the way (size, bits, fields). frames_per_second: 0 if unknown or a picture.
-  FramePath(const AVFrame& first, bool is_picture, double frames_per_second,
-            const EngineOptions& options, Console& console);
+  // what is lost on the way (size, bits, fields).
+  FramePath(const AVFrame& first, const Source& source, const EngineOptions& options,
+            Console& console);
 
   const FrameSize& size() const { return size_; }
   AVChromaLocation siting() const { return siting_; }
@@ -32,7 +34,7 @@ class FramePath {
   const Nv21Frame& run(const AVFrame& frame);
 
  private:
-  FramePath(EngineKind kind, const AVFrame& first, bool is_picture, double frames_per_second,
+  FramePath(EngineKind kind, const AVFrame& first, const Source& source,
             const EngineOptions& options, Console& console);
 
   FrameSize size_;

@@ -14,6 +14,9 @@ constexpr int kWindow = 11;
 constexpr double kSigma = 1.5;
 constexpr double kPeak = 255;
 
+// Below it a colour is grey but for the rounding of the sRGB matrix.
+constexpr double kLeastChroma = 0.1;
+
 using Plane = std::vector<double>;
 
 Plane luma_of(const RgbPicture& picture) {
@@ -119,6 +122,7 @@ double mean_hue_shift(const RgbPicture& reference, const RgbPicture& picture) {
   for (size_t i = 0; i < reference.bytes.size(); i += 3) {
     const Lab wanted = lab_of_srgb(&reference.bytes[i]);
     const double weight = chroma(wanted);
+    if (weight < kLeastChroma) continue;
     sum += weight * hue_difference(wanted, lab_of_srgb(&picture.bytes[i]));
     weights += weight;
   }

@@ -32,7 +32,7 @@ int level_of(const EngineOptions& options) {
 }  // namespace
 
 PreviewEngine::PreviewEngine(int width, int height, const EngineOptions& options,
-                             double frames_per_second, Console& console)
+                             const Source& source, Console& console)
     : width_(width), height_(height), level_(level_of(options)) {
   if (options.strength == 0) {
     console.note(
@@ -40,8 +40,8 @@ PreviewEngine::PreviewEngine(int width, int height, const EngineOptions& options
         "middle tones; --engine photo leaves the picture as it is");
   }
   if (!options.level && !options.strength) {
-    const double rate = frames_per_second > 0 ? frames_per_second : kUsualRate;
-    judge_.emplace(std::nullopt, rate);
+    const double rate = source.frames_per_second > 0 ? source.frames_per_second : kUsualRate;
+    judge_.emplace(std::nullopt, rate, source.orientation);
     frames_to_judge_ = std::max(1, static_cast<int>(std::lround(rate)));
   }
   InitHazePreviewFormat(kInputFormatNv21, width, height);

@@ -12,8 +12,7 @@ namespace dehaze {
 
 class PreviewEngine : public Engine {
  public:
-  // frames_per_second: 0 for pictures or if unknown.
-  PreviewEngine(int width, int height, const EngineOptions& options, double frames_per_second,
+  PreviewEngine(int width, int height, const EngineOptions& options, const Source& source,
                 Console& console);
   ~PreviewEngine() override;
 

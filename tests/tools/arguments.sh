@@ -119,6 +119,9 @@ case_compare_tool() {
   raw_picture b.png ABA
   equal "$("$HAZE_COMPARE" a.png a.png)" "psnr inf dB ssim 1.0000"
   equal "$("$HAZE_COMPARE" a.png b.png)" "psnr 52.90 dB ssim 1.0000"
+  "$HAZE_COMPARE" --all a.png b.png |
+    holds '^psnr 52.90 dB ssim 1.0000 ciede2000 1.070 hue 0.000 degrees clipped 0.000 %$' ||
+    fail "$("$HAZE_COMPARE" --all a.png b.png)"
   # Equal means and no structure in common.
   make_input -f lavfi -i "color=gray:size=160x120,noise=alls=40:all_seed=1" -frames:v 1 n1.png
   make_input -f lavfi -i "color=gray:size=160x120,noise=alls=40:all_seed=2" -frames:v 1 n2.png

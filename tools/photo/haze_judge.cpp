@@ -57,9 +57,11 @@ double Removal::transmission(double share) const {
   return std::max(1 - amount * haze, least_transmission);
 }
 
-HazeJudge::HazeJudge(std::optional<int> strength, double frames_per_second)
+HazeJudge::HazeJudge(std::optional<int> strength, double frames_per_second,
+                     const Orientation& orientation)
     : strength_(strength),
-      memory_(kSecondsOfMemory * (frames_per_second > 0 ? frames_per_second : kUsualRate)) {}
+      memory_(kSecondsOfMemory * (frames_per_second > 0 ? frames_per_second : kUsualRate)),
+      orientation_(orientation) {}
 
 bool HazeJudge::is_cut(const BgrImage& small) const {
   if (!last_ || last_->bytes.size() != small.bytes.size()) return true;
@@ -77,7 +79,7 @@ bool HazeJudge::look_at(BgrImage& small) {
     haze_ = {};
   }
   last_ = small;
-  const Light found = estimate_light(small);
+  const Light found = estimate_light(small, orientation_);
   for (size_t c = 0; c < found.size(); ++c) {
     light_means_[c].add(found[c], memory_);
     const double mean = light_means_[c].mean();

@@ -5,6 +5,7 @@
 #include <array>
 #include <optional>
 
+#include "media/orientation.h"
 #include "photo/haze_map.h"
 
 namespace dehaze {
@@ -33,8 +34,9 @@ struct Removal {
 // not flicker, and start anew at a cut.
 class HazeJudge {
  public:
-  // Without a strength (0 ... 100) it is judged. frames_per_second: 0 if unknown.
-  HazeJudge(std::optional<int> strength, double frames_per_second);
+  // Without a strength (0 ... 100) it is judged. frames_per_second: 0 if unknown. orientation: of the
+  // frames as they are stored.
+  HazeJudge(std::optional<int> strength, double frames_per_second, const Orientation& orientation);
 
   // To be called first for each frame: looks at its light. True for the first frame after a cut, and
   // the first of all.
@@ -52,6 +54,7 @@ class HazeJudge {
 
   std::optional<int> strength_;
   double memory_;
+  Orientation orientation_;
   std::array<SteadyValue, 3> light_means_;
   SteadyValue haze_;
   Light light_ = {255, 255, 255};

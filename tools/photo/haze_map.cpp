@@ -43,6 +43,13 @@ int window_radius(int width, int height, int part) {
   return std::max(1, std::min(std::max(width, height) / part, largest));
 }
 
+// 0 to 1 down the picture as it is seen.
+double depth_in_view(int x, int y, const BgrImage& image, const Orientation& orientation) {
+  const double depth = orientation.transposed ? static_cast<double>(x) / image.width
+                                              : static_cast<double>(y) / image.height;
+  return orientation.flipped_y ? 1 - depth : depth;
+}
+
 // How much a pixel looks like thick haze, by its dark channel and its height: `depth` goes from 0 to
 // 1 down the picture.
 uint8_t haze_score(int dark, double depth) {
@@ -164,7 +171,7 @@ BgrImage reduced(const BgrImage& image) {
   return small;
 }
 
-Light estimate_light(BgrImage& small) {
+Light estimate_light(BgrImage& small, const Orientation& orientation) {
   const int w = small.width;
   const int h = small.height;
   const size_t pixels = small.bytes.size() / 3;
@@ -175,9 +182,12 @@ Light estimate_light(BgrImage& small) {
   const int radius = window_radius(w, h, kLightWindowPart);
   CalculateDarkChannelPreview(darkest.data(), dark.data(), histogram.data(), w, h, radius);
   std::fill(histogram.begin(), histogram.end(), 0);
-  for (size_t i = 0; i < pixels; ++i) {
-    dark[i] = haze_score(dark[i], static_cast<double>(i) / static_cast<double>(pixels));
-    ++histogram[dark[i]];
+  uint8_t* value = dark.data();
+  for (int y = 0; y < h; ++y) {
+    for (int x = 0; x < w; ++x) {
+      *value = haze_score(*value, depth_in_view(x, y, small, orientation));
+      ++histogram[*value++];
+    }
   }
   Light light;
   EstimateAPreview(dark.data(), small.bytes.data(), histogram.data(), light.data(), w, h);

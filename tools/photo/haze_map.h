@@ -12,6 +12,7 @@
 #include <array>
 
 #include "media/nv21.h"
+#include "media/orientation.h"
 #include "photo/planes.h"
 
 namespace dehaze {
@@ -28,7 +29,7 @@ BgrImage reduced(const BgrImage& image);
 
 // Colour of the thickest haze: the mean over the brightest part of the dark channel, the upper part of
 // the picture coming first.
-Light estimate_light(BgrImage& small);
+Light estimate_light(BgrImage& small, const Orientation& orientation);
 
 // What the guided filter learns: around each pixel of the small picture the share of the haze is
 // slope * (share by the pixel alone) + offset.

@@ -8,8 +8,8 @@
 
 namespace dehaze {
 
-PhotoEngine::PhotoEngine(std::optional<int> strength, double frames_per_second)
-    : judge_(strength, frames_per_second) {}
+PhotoEngine::PhotoEngine(std::optional<int> strength, const Source& source)
+    : judge_(strength, source.frames_per_second, source.orientation) {}
 
 void PhotoEngine::process(Nv21Frame& frame) {
   using Clock = std::chrono::steady_clock;

@@ -14,8 +14,8 @@ namespace dehaze {
 
 class PhotoEngine : public Engine {
  public:
-  // Without a strength it is judged from the frames. frames_per_second: 0 for pictures.
-  PhotoEngine(std::optional<int> strength, double frames_per_second);
+  // Without a strength it is judged from the frames.
+  PhotoEngine(std::optional<int> strength, const Source& source);
 
   void process(Nv21Frame& frame) override;
   HazeFindings findings() const override;

@@ -1,0 +1,134 @@
+#!/usr/bin/env bash
+# How much is taken out, and that it stays the same over time.
+source "$(dirname "$0")/lib.sh"
+
+# make_hazy FILE SIZE RED GREEN BLUE: grey stripes from black to white, seen through haze of that
+# colour which thickens from nothing at the bottom to all there is in the upper quarter.
+make_hazy() {
+  local t="clip((Y/H-0.25)/0.75\,0\,1)" stripes="255*mod(floor(X/8)\,4)/3"
+  make_input -f lavfi -i "color=black:size=$2,format=gbrp" -frames:v 1 \
+    -vf "geq=r='$stripes*$t+$3*(1-$t)':g='$stripes*$t+$4*(1-$t)':b='$stripes*$t+$5*(1-$t)',format=rgb24" \
+    "$1"
+}
+
+strength_of() { "$DEHAZE" --show light "$@" | sed -E 's/.* strength //'; }
+
+# Standard deviation of luma, times 100.
+luma_deviation() {
+  ffmpeg -nostdin -v error -i "$1" -vf "format=gray,showinfo" -f null - -loglevel info 2>&1 |
+    sed -nE 's/.*stdev:\[([0-9.]+).*/\1/p' | awk '{printf "%d\n", $1 * 100}'
+}
+
+case_zero_changes_nothing() {
+  make_hazy in.png 320x240 205 208 212
+  make_input -loop 1 -i in.png -frames:v 3 \
+    -vf "scale=out_color_matrix=smpte170m:out_range=full,format=yuv420p" -color_range pc \
+    -colorspace smpte170m in.y4m
+  dehaze --engine photo --strength 0 in.y4m out.y4m
+  says_nothing
+  equal "$(frame_digest out.y4m)" "$(frame_digest in.y4m)"
+  dehaze --engine photo --strength 0 in.png out.png
+  close_pictures in.png out.png 30
+  # The other engine says what is left.
+  dehaze --engine preview --strength 0 in.y4m preview.y4m
+  says 'tone curve'
+}
+
+case_grows_with_the_number() {
+  make_hazy in.png 320x240 205 208 212
+  local engine strength before after
+  for engine in photo preview; do
+    before=0
+    for strength in 0 40 70 100; do
+      dehaze --quiet --force --engine $engine --strength $strength in.png out.png
+      after=$(luma_deviation out.png)
+      [ "$after" -gt "$before" ] || fail "$engine: deviation $after at $strength, $before below"
+      before=$after
+    done
+  done
+}
+
+case_auto_tells_haze_from_clear_air() {
+  make_hazy hazy.png 320x240 205 208 212
+  make_input -i hazy.png -vf "lutrgb=r='40+val*0.75':g='40+val*0.75':b='42+val*0.75'" thick.png
+  equal "$(strength_of thick.png)" 100 "strength for thick haze"
+  # Full range of values everywhere: nothing to take out.
+  make_input -f lavfi -i testsrc2=size=640x480 -frames:v 1 -vf format=rgb24 clear.png
+  local strength
+  strength=$(strength_of clear.png)
+  [ "$strength" -le 20 ] || fail "strength $strength for a clear picture"
+  # The preview engine goes by the same measure, to a part of its scale.
+  equal "$(strength_of --engine preview thick.png)" 60
+  strength=$(strength_of --engine preview clear.png)
+  [ "$strength" -le 15 ] || fail "strength $strength for a clear picture"
+}
+
+# Mean of a channel over the lower half, where there is something to see.
+channel_mean() { # FILE CHANNEL
+  ffmpeg -nostdin -v error -i "$1" -vf "crop=iw:ih/2:0:ih/2,extractplanes=$2,scale=1:1:flags=area" \
+    -f rawvideo - | od -An -tu1 | tr -d ' '
+}
+
+case_coloured_light_is_taken_out() {
+  make_hazy in.png 640x480 226 196 150
+  "$DEHAZE" --show light in.png |
+    holds '^light 22[4-8] 19[4-8] 1(4[89]|5[012]) strength' || fail "$("$DEHAZE" --show light in.png)"
+  dehaze in.png out.png
+  local before after
+  before=$(($(channel_mean in.png r) - $(channel_mean in.png b)))
+  after=$(($(channel_mean out.png r) - $(channel_mean out.png b)))
+  # The stripes are grey.
+  [ $((after * 2)) -lt "$before" ] || fail "red less blue: $before before, $after after"
+}
+
+case_light_is_looked_for_upwards() {
+  # Haze above, something whiter below; upright, and stored the other way up with a tag.
+  make_input -f lavfi -i color=0xa0a8b0:size=320x240 -frames:v 1 \
+    -vf "drawbox=y=150:h=90:color=0xd0d0d0:t=fill,drawbox=y=100:h=50:color=0x303030:t=fill" up.png
+  make_input -loop 1 -i up.png -frames:v 5 -pix_fmt yuv420p -c:v libx264 -qp 10 up.mp4
+  make_input -loop 1 -i up.png -frames:v 5 -vf hflip,vflip -pix_fmt yuv420p -c:v libx264 -qp 10 \
+    down.mp4
+  make_input -i down.mp4 -c copy -metadata:s:v rotate=180 turned.mp4
+  local file
+  for file in up turned; do
+    "$DEHAZE" --engine photo --show light $file.mp4 | holds '^light 1[56].* ' ||
+      fail "$file: $("$DEHAZE" --engine photo --show light $file.mp4)"
+  done
+}
+
+# Root of the mean square of the change of mean luma from frame to frame.
+flicker() {
+  ffmpeg -nostdin -v error -i "$1" \
+    -vf "signalstats,metadata=print:key=lavfi.signalstats.YAVG:file=-" -f null - |
+    sed -nE 's/.*YAVG=//p' |
+    awk 'NR > 1 { sum += ($1 - last) ^ 2 } { last = $1 } END { printf "%.4f\n", sqrt(sum / (NR - 1)) }'
+}
+
+case_still_video_does_not_flicker() {
+  make_hazy in.png 640x480 205 208 212
+  make_input -loop 1 -i in.png -frames:v 60 -r 25 -vf "format=yuv420p,noise=alls=12:allf=t" in.y4m
+  local engine rms
+  for engine in photo preview; do
+    dehaze --engine $engine in.y4m $engine.y4m
+    equal "$(frame_times $engine.y4m | wc -l)" 60 frames
+    rms=$(flicker $engine.y4m)
+    awk "BEGIN { exit !($rms > 0 && $rms < 0.05) }" || fail "$engine: RMS $rms"
+  done
+}
+
+case_cut_starts_anew() {
+  # The second scene must look as it does alone.
+  make_hazy a.png 320x240 205 208 212
+  make_hazy b.png 320x240 120 100 80
+  local scene
+  for scene in a b; do
+    make_input -loop 1 -i $scene.png -frames:v 10 -r 25 -vf format=yuv420p $scene.y4m
+  done
+  make_input -i a.y4m -i b.y4m -filter_complex concat ab.y4m
+  dehaze --engine photo ab.y4m ab_out.y4m
+  dehaze --engine photo b.y4m b_out.y4m
+  equal "$(frame_digest ab_out.y4m | tail -n 10 | cut -d, -f6)" \
+    "$(frame_digest b_out.y4m | cut -d, -f6)"
+}
+
+run_case "$1"
