@@ -64,8 +64,7 @@ class Collector {
  public:
   Collector(const ReportOptions& options, const Reader& reader, const AVFrame& first,
             int64_t expected_frames, Console& console)
-      : path_(first, reader.is_picture(), reader.is_picture() ? 0 : frames_per_second(reader),
-              options.engine, console),
+      : path_(first, source_of(reader, first), options.engine, console),
         to_nv21_(path_.size(), reader.is_picture(), path_.siting()),
         before_(path_.size().padded_width(), path_.size().padded_height()),
         view_maker_(reader, first, path_.size(), path_.siting()),
