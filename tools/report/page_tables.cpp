@@ -78,7 +78,6 @@ std::string row(const std::string& name, const std::string& cells) {
 std::string timing_row(const std::string& name, const std::vector<double>& ms) {
   if (ms.empty()) return "";
   return row(name, cell(std::to_string(ms.size())) + cell(milliseconds(median(ms))) +
-                       cell(milliseconds(mean(ms))) +
                        cell(milliseconds(*std::min_element(ms.begin(), ms.end()))) +
                        cell(milliseconds(*std::max_element(ms.begin(), ms.end()))));
 }
@@ -105,24 +104,13 @@ double mean_quality(const ReportData& data, std::optional<Quality> View::*when,
   return mean_of(data.views, [=](const View& view) { return *(view.*when).*value; });
 }
 
-std::string quality_row(const ReportData& data, const char* name,
-                        std::optional<Quality> View::*when) {
-  std::string cells;
-  for (const Metric& metric : kMetrics) {
-    cells += cell(number(mean_quality(data, when, metric.value), metric.decimals));
-  }
-  return row(name, cells);
-}
-
-std::string change_row(const ReportData& data) {
-  std::string cells;
-  for (const Metric& metric : kMetrics) {
-    const double before = mean_quality(data, &View::quality_before, metric.value);
-    const double after = mean_quality(data, &View::quality_after, metric.value);
-    const double gain = before == after ? 0 : after - before;  // both may be infinite
-    cells += cell((gain > 0 ? "+" : "") + number(gain, metric.decimals));
-  }
-  return row("Change", cells);
+std::string quality_row(const ReportData& data, const Metric& metric) {
+  const double before = mean_quality(data, &View::quality_before, metric.value);
+  const double after = mean_quality(data, &View::quality_after, metric.value);
+  const double change = before == after ? 0 : after - before;  // both may be infinite
+  return row(metric.name, cell(number(before, metric.decimals)) +
+                              cell(number(after, metric.decimals)) +
+                              cell((change > 0 ? "+" : "") + number(change, metric.decimals)));
 }
 
 std::string quality_fact(const ReportData& data) {
@@ -172,12 +160,11 @@ std::string facts(const ReportData& data) {
 std::string quality(const ReportData& data) {
   if (data.reference_name.empty()) return "";
   if (!has_quality(data)) return "<p>The pictures are too small to be compared.</p>\n";
-  std::vector<std::string> columns = {""};
-  for (const Metric& metric : kMetrics) columns.push_back(metric.name);
+  std::string rows;
+  for (const Metric& metric : kMetrics) rows += quality_row(data, metric);
   const size_t count = data.views.size();
-  return table(columns, quality_row(data, "Before", &View::quality_before) +
-                            quality_row(data, "After", &View::quality_after) + change_row(data)) +
-         "<p class=\"remark\">Against " + escaped(data.reference_name) +
+  return table({"", "Before", "After", "Change"}, rows) + "<p class=\"remark\">Against " +
+         escaped(data.reference_name) +
          (count > 1 ? ", mean of the " + std::to_string(count) + " frames that are shown" : "") +
          ". PSNR of all RGB samples and mean SSIM of luma: more is closer. Mean CIEDE2000 colour "
          "difference and mean shift of the hue of coloured pixels: less is closer.</p>\n";
@@ -190,7 +177,7 @@ std::string timing(const ReportData& data) {
            " ms for the haze removal alone, without decoding and conversion.</p>\n";
   }
   const bool has_kinds = !times.reuse_ms.empty();
-  return table({"Milliseconds", "Frames", "Median", "Mean", "Least", "Most"},
+  return table({"Milliseconds", "Frames", "Median", "Least", "Most"},
                timing_row(has_kinds ? "Estimate" : "Every frame", times.estimate_ms) +
                    timing_row("Reuse", times.reuse_ms)) +
          "<p class=\"remark\">Haze removal alone, without decoding and conversion" +
