@@ -55,7 +55,8 @@ void HazeRemovingThreadPreview(unsigned char* luma, unsigned char* chroma, float
 
 void* HRThreadPreview(void* arg) {
   const haze::StripeCode code = haze::decode_stripe(arg);
-  if (!haze::is_stripe(code, kStripes)) return nullptr;
+  // Of a frame with an odd height the first stripes would have whole blocks.
+  if (!haze::is_stripe(code, kStripes) || !has_blocks(gHRWPreview, gHRHWPreview)) return nullptr;
   const ptrdiff_t width = gHRWPreview;
   const ptrdiff_t height = gHRHWPreview;
   const haze::StripeRange rows = haze::even_stripe(gHRHWPreview, kStripes, code.stripe);

@@ -323,10 +323,11 @@ TEST(StripeWorker, OtherJobsTouchNothing) {
   EXPECT_EQ(gHRHWPreview, 16);
 }
 
-TEST(StripeWorker, EmptySizesWriteNothing) {
+TEST(StripeWorker, EmptyAndOddSizesWriteNothing) {
   Map map(256, 0.5f);
-  const int sizes[][2] = {{0, 0},   {0, 16},       {16, 0},       {-2, 16},  {16, -2}, {-2, -2},
-                          {-8, -8}, {INT_MIN, 16}, {16, INT_MIN}, {-16, 16}, {4, -16}};
+  const int sizes[][2] = {{0, 0},        {0, 16},       {16, 0},   {-2, 16}, {16, -2},
+                          {-2, -2},      {-8, -8},      {16, 13},  {15, 16}, {16, 1},
+                          {INT_MIN, 16}, {16, INT_MIN}, {-16, 16}, {4, -16}};
   for (const auto& size : sizes) {
     GuardedBuffer<uint8_t> frame(1200, 60);
     fill_slot(3, frame.data() + 600, map.data() + 128, {1, 2, 3}, size[0], size[1]);
