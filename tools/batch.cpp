@@ -88,6 +88,10 @@ class Batch {
 
   void print_messages(Worker& worker) {
     for (const std::string& note : worker.take_notes()) console_.note(worker.input() + ": " + note);
+    for (const std::string& line : worker.take_infos()) {
+      console_.clear_progress();
+      print_info(worker.input() + ": " + line);
+    }
     for (const std::string& line : worker.take_output()) {
       console_.clear_progress();
       print_line(stdout, worker.input() + ": " + line);

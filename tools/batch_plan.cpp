@@ -75,7 +75,8 @@ class Planner {
       std::error_code ignored;
       if (path.filename().string()[0] == '.') continue;
       if (!entry.is_directory(ignored)) {
-        add_found_file(path, output_folder);
+        // A named pipe would be waited for.
+        if (entry.is_regular_file(ignored)) add_found_file(path, output_folder);
       } else if (options_.recurse && !entry.is_symlink(ignored) && !is_output_folder(path)) {
         add_folder(path, output_folder / path.filename());
       }

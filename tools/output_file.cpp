@@ -78,14 +78,17 @@ void check_output_path(const std::string& input, const std::string& output, bool
 
 OutputFile::OutputFile(const std::string& path, bool overwrite)
     : path_(resolve_links(path)), temporary_path_(temporary_name(path_)), overwrite_(overwrite) {
+  // Before it is made, so that a signal at any time finds its name.
+  set_unfinished_file(temporary_path_);
   // O_EXCL: never write through a file or link that somebody else put there.
   const int descriptor = open(temporary_path_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC,
                               S_IRUSR | S_IWUSR | S_IRGRP | S_IWGRP | S_IROTH | S_IWOTH);
   if (descriptor < 0) {
-    throw Error(path + ": cannot create a file in that folder: " + strerror(errno));
+    const int failure = errno;
+    set_unfinished_file("");
+    throw Error(path + ": cannot create a file in that folder: " + strerror(failure));
   }
   close(descriptor);
-  set_unfinished_file(temporary_path_);
 }
 
 OutputFile::~OutputFile() {

@@ -11,6 +11,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
+#include <utility>
 
 #include "console.h"
 #include "errors.h"
@@ -23,6 +24,7 @@ namespace {
 // The words that begin the lines from child to parent.
 constexpr const char* kShare = "share ";
 constexpr const char* kNote = "note ";
+constexpr const char* kInfo = "info ";
 constexpr const char* kPrint = "print ";
 constexpr const char* kJson = "json ";
 constexpr const char* kDone = "done ";
@@ -68,7 +70,7 @@ int work(const Options& options, const WorkerConsole& sender, Console& console) 
   if (options.engine.show == Show::kLight && !options.json) {
     sender.send(kPrint, describe(result.outcome->report.findings));
   }
-  if (options.timing) sender.send(kNote, timing_text(result));
+  if (options.timing) sender.send(kInfo, timing_text(result));
   sender.send(kDone, "");
   return kExitDone;
 }
@@ -153,6 +155,8 @@ void Worker::handle(const std::string& line) {
     share_ = std::clamp(std::atof(rest.c_str()), 0.0, 1.0);
   } else if (take_word(line, kNote, rest)) {
     notes_.push_back(rest);
+  } else if (take_word(line, kInfo, rest)) {
+    infos_.push_back(rest);
   } else if (take_word(line, kPrint, rest)) {
     output_.push_back(rest);
   } else if (take_word(line, kJson, rest)) {
@@ -174,16 +178,8 @@ void Worker::wait() {
   if (WIFSIGNALED(status)) failure_ += std::string(", ") + strsignal(WTERMSIG(status));
 }
 
-std::vector<std::string> Worker::take_notes() {
-  std::vector<std::string> notes;
-  notes.swap(notes_);
-  return notes;
-}
-
-std::vector<std::string> Worker::take_output() {
-  std::vector<std::string> output;
-  output.swap(output_);
-  return output;
-}
+std::vector<std::string> Worker::take_notes() { return std::exchange(notes_, {}); }
+std::vector<std::string> Worker::take_infos() { return std::exchange(infos_, {}); }
+std::vector<std::string> Worker::take_output() { return std::exchange(output_, {}); }
 
 }  // namespace dehaze

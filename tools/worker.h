@@ -35,8 +35,10 @@ class Worker {
   const std::string& failure() const { return failure_; }
   const std::string& json() const { return json_; }
 
-  // What is to be printed about the file: to standard error, and to standard output. Taken once.
+  // What is to be printed about the file, taken once: notes, what is printed in spite of --quiet, and
+  // what goes to standard output.
   std::vector<std::string> take_notes();
+  std::vector<std::string> take_infos();
   std::vector<std::string> take_output();
 
  private:
@@ -52,6 +54,7 @@ class Worker {
   std::string failure_;
   std::string json_;
   std::vector<std::string> notes_;
+  std::vector<std::string> infos_;
   std::vector<std::string> output_;
 };
 

@@ -92,6 +92,26 @@ case_no_recurse() {
   equal "$(files_in out)" "a.png "
 }
 
+case_timing_and_light() {
+  mkdir in
+  make_picture in/a.png 160x160
+  make_picture in/b.png 160x160
+  "$DEHAZE" --quiet --timing --show light in -o out >light 2>messages
+  equal "$(wc -l <messages)" 2 lines
+  says '^dehaze: in/a.png: time per frame: estimate '
+  equal "$(grep -Ec '^in/[ab].png: light [0-9. ]+strength [0-9.]+$' light)" 2 "lights in $(cat light)"
+}
+
+case_no_waiting_for_pipes() {
+  mkdir in
+  make_picture in/a.png 160x160
+  mkfifo in/b.png
+  ln -s missing.png in/c.png
+  ln -s ../in in/loop
+  timeout 20 "$DEHAZE" in -o out 2>messages
+  equal "$(files_in out)" "a.png "
+}
+
 case_nothing_to_do() {
   mkdir empty
   dehaze_fails 1 'no pictures or videos in empty' empty -o out
