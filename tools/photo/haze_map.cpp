@@ -1,6 +1,7 @@
 #include "photo/haze_map.h"
 
 #include <algorithm>
+#include <cmath>
 
 #include "haze_preview.h"
 
@@ -33,6 +34,11 @@ constexpr float kProbeStrength = 0.3F;
 // first pixel of a block and used for all four.
 constexpr float kDarkestResult = 6;
 constexpr float kBrightestResult = 250;
+
+// Of transmission_for_tint, in steps of U and V.
+constexpr float kLeastTint = 0.5F;
+constexpr float kOppositeTint = 12;
+constexpr float kOppositeGain = 4;
 
 int longer_side(const BgrImage& image) { return std::max(image.width, image.height); }
 int shorter_side(const BgrImage& image) { return std::min(image.width, image.height); }
@@ -141,16 +147,45 @@ Plane enlarged(Plane plane, int width, int height) {
   return cropped;
 }
 
-// The share at which the first channel of the pixel reaches the end of the range. Of the haze model
-// itself: I - A = (J - A) t.
-float largest_share(const uint8_t* bgr, const Light& light) {
-  float least_transmission = 0;
+// Least transmission that keeps every channel of the pixel within the range. Of the haze model itself:
+// I - A = (J - A) t.
+float transmission_for_range(const uint8_t* bgr, const Light& light) {
+  float least = 0;
   for (size_t c = 0; c < light.size(); ++c) {
     const float step = static_cast<float>(bgr[c]) - light[c];
     const float room = step > 0 ? kBrightestResult - light[c] : light[c] - kDarkestResult;
-    least_transmission = std::max(least_transmission, std::abs(step) / std::max(room, 1.0F));
+    least = std::max(least, std::abs(step) / std::max(room, 1.0F));
   }
-  return 1 - std::min(least_transmission, 1.0F);
+  return least;
+}
+
+struct Chroma {
+  float u;
+  float v;
+};
+
+// BT.601, around 0.
+Chroma chroma_of(const uint8_t* bgr) {
+  const float luma = 0.114F * bgr[0] + 0.587F * bgr[1] + 0.299F * bgr[2];
+  return {0.564F * (bgr[0] - luma), 0.713F * (bgr[2] - luma)};
+}
+
+// Least transmission that keeps a pixel with the tint of a coloured light from getting the opposite
+// one: asphalt in yellow haze may turn grey, not blue. What has the opposite tint in spite of the
+// haze may get much more of it.
+float transmission_for_tint(const uint8_t* bgr, Chroma light) {
+  const float tint = std::hypot(light.u, light.v);
+  if (tint < kLeastTint) return 0;
+  const Chroma pixel = chroma_of(bgr);
+  const float along = (pixel.u * light.u + pixel.v * light.v) / tint;
+  const float farthest = -kOppositeTint - kOppositeGain * std::max(-along, 0.0F);
+  return (tint - along) / (tint - farthest);
+}
+
+float largest_share(const uint8_t* bgr, const Light& light, Chroma light_chroma) {
+  const float least =
+      std::max(transmission_for_range(bgr, light), transmission_for_tint(bgr, light_chroma));
+  return 1 - std::clamp(least, 0.0F, 1.0F);
 }
 
 }  // namespace
@@ -204,10 +239,11 @@ Plane share_of_haze(BgrImage& image, const GuidedModel& model, const Light& ligh
   const Plane slope = enlarged(model.slope, image.width, image.height);
   const Plane offset = enlarged(model.offset, image.width, image.height);
   Plane share = dark_shares(image, light).pixel;
+  const Chroma light_chroma = chroma_of(light.data());
   const uint8_t* bgr = image.bytes.data();
   for (size_t i = 0; i < share.values.size(); ++i) {
     const float value = offset.values[i] + slope.values[i] * share.values[i];
-    share.values[i] = std::clamp(value, 0.0F, largest_share(bgr, light));
+    share.values[i] = std::clamp(value, 0.0F, largest_share(bgr, light, light_chroma));
     bgr += 3;
   }
   return share;
