@@ -19,10 +19,15 @@ constexpr double kLeastChroma = 0.1;
 
 using Plane = std::vector<double>;
 
-Plane luma_of(const RgbPicture& picture) {
-  Plane luma(picture.bytes.size() / 3);
+// Rows of windows that are worked on at a time: the planes of a large picture would fill the memory.
+constexpr size_t kBandRows = 256;
+
+// Of `rows` rows from `first_row` on.
+Plane luma_of(const RgbPicture& picture, size_t first_row, size_t rows) {
+  const size_t width = static_cast<size_t>(picture.width);
+  Plane luma(width * rows);
   for (size_t i = 0; i < luma.size(); ++i) {
-    const uint8_t* rgb = &picture.bytes[i * 3];
+    const uint8_t* rgb = &picture.bytes[(first_row * width + i) * 3];
     luma[i] = 0.299 * rgb[0] + 0.587 * rgb[1] + 0.114 * rgb[2];
   }
   return luma;
@@ -73,6 +78,24 @@ Plane product(const Plane& a, const Plane& b) {
   return result;
 }
 
+// Of every window of two bands of luma, in the order of the picture.
+void add_ssim(const Plane& a, const Plane& b, size_t width, size_t height, double& sum) {
+  constexpr double kC1 = (0.01 * kPeak) * (0.01 * kPeak);
+  constexpr double kC2 = (0.03 * kPeak) * (0.03 * kPeak);
+  const Plane mean_a = window_means(a, width, height);
+  const Plane mean_b = window_means(b, width, height);
+  const Plane mean_aa = window_means(product(a, a), width, height);
+  const Plane mean_bb = window_means(product(b, b), width, height);
+  const Plane mean_ab = window_means(product(a, b), width, height);
+  for (size_t i = 0; i < mean_a.size(); ++i) {
+    const double means = mean_a[i] * mean_b[i];
+    const double squares = mean_a[i] * mean_a[i] + mean_b[i] * mean_b[i];
+    const double covariance = mean_ab[i] - means;
+    const double variances = mean_aa[i] + mean_bb[i] - squares;
+    sum += (2 * means + kC1) * (2 * covariance + kC2) / ((squares + kC1) * (variances + kC2));
+  }
+}
+
 }  // namespace
 
 double psnr_rgb(const RgbPicture& a, const RgbPicture& b) {
@@ -86,26 +109,14 @@ double psnr_rgb(const RgbPicture& a, const RgbPicture& b) {
 }
 
 double ssim_luma(const RgbPicture& picture_a, const RgbPicture& picture_b) {
-  constexpr double kC1 = (0.01 * kPeak) * (0.01 * kPeak);
-  constexpr double kC2 = (0.03 * kPeak) * (0.03 * kPeak);
   const size_t width = static_cast<size_t>(picture_a.width);
-  const size_t height = static_cast<size_t>(picture_a.height);
-  const Plane a = luma_of(picture_a);
-  const Plane b = luma_of(picture_b);
-  const Plane mean_a = window_means(a, width, height);
-  const Plane mean_b = window_means(b, width, height);
-  const Plane mean_aa = window_means(product(a, a), width, height);
-  const Plane mean_bb = window_means(product(b, b), width, height);
-  const Plane mean_ab = window_means(product(a, b), width, height);
+  const size_t window_rows = static_cast<size_t>(picture_a.height) - kWindow + 1;
   double sum = 0;
-  for (size_t i = 0; i < mean_a.size(); ++i) {
-    const double means = mean_a[i] * mean_b[i];
-    const double squares = mean_a[i] * mean_a[i] + mean_b[i] * mean_b[i];
-    const double covariance = mean_ab[i] - means;
-    const double variances = mean_aa[i] + mean_bb[i] - squares;
-    sum += (2 * means + kC1) * (2 * covariance + kC2) / ((squares + kC1) * (variances + kC2));
+  for (size_t row = 0; row < window_rows; row += kBandRows) {
+    const size_t rows = std::min(kBandRows, window_rows - row) + kWindow - 1;
+    add_ssim(luma_of(picture_a, row, rows), luma_of(picture_b, row, rows), width, rows, sum);
   }
-  return sum / static_cast<double>(mean_a.size());
+  return sum / static_cast<double>((width - kWindow + 1) * window_rows);
 }
 
 double mean_ciede2000(const RgbPicture& a, const RgbPicture& b) {
