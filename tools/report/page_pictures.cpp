@@ -66,6 +66,7 @@ void fit_range(LineChart& chart) {
 template <typename Value>
 std::vector<double> values_of(const std::vector<Moment>& moments, Value value) {
   std::vector<double> values;
+  values.reserve(moments.size());
   for (const Moment& moment : moments) values.push_back(value(moment));
   return values;
 }
