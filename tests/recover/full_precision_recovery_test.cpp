@@ -1,20 +1,16 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <climits>
 #include <cstdint>
 #include <cstdlib>
-#include <string>
-#include <thread>
 #include <vector>
 
 #include "haze_preview.h"
 #include "tests/reference/reciprocal_recovery.h"
 #include "tests/reference/tone_curve.h"
 #include "tests/support/bytes_match.h"
-#include "tests/support/guarded_buffer.h"
+#include "tests/support/float_recovery.h"
 #include "tests/support/moods.h"
-#include "tests/support/planar_recovery.h"
 #include "tests/support/random.h"
 #include "tests/support/recovery_inputs.h"
 
@@ -24,12 +20,6 @@ namespace {
 using Frame = std::vector<uint8_t>;
 using Map = std::vector<float>;
 using reference::kToneCurve;
-
-class FullPrecisionRecovery : public ::testing::TestWithParam<PlanarMember> {};
-
-INSTANTIATE_TEST_SUITE_P(Members, FullPrecisionRecovery,
-                         ::testing::Values(kAnchors, kInteger, kSingle),
-                         [](const auto& member) { return std::string(member.param.name); });
 
 // The shift rounds down, so a byte below the light's falls by one even where nothing is to recover.
 TEST(IntegerRecovery, ClearTransmission) {
@@ -88,7 +78,7 @@ TEST(IntegerRecovery, ExtremeChromaOfTheLight) {
         const reference::LightYuv yuv = reference::light_to_yuv(light.data());
         EXPECT_GE(std::min(yuv.u, yuv.v), 1);
         EXPECT_LE(std::max(yuv.u, yuv.v), 255);
-        for (const PlanarMember& member : {kAnchors, kInteger, kSingle})
+        for (const FloatRecovery& member : {kAnchors, kInteger, kSingle})
           compare(member, AllValues::frame(), AllValues::map(0.6f), light, AllValues::kWidth,
                   AllValues::kHeight);
       }
@@ -135,126 +125,6 @@ TEST(SingleRecovery, IntegersAndFloatsStayWithinOneAtFullTransmission) {
     }
   }
   EXPECT_GT(differing, 0);
-}
-
-TEST_P(FullPrecisionRecovery, LastArgumentHasNoEffect) {
-  Random random(test_seed());
-  const Frame frame = make_frame(random, Mood::kNoise, Colours::kWild, 20, 14);
-  const Map map = make_transmissions(random, TransmissionMood::kUsual, 20, 14);
-  for (const int ignored : {0, 1, -1, 7, 255, INT_MAX, INT_MIN})
-    compare(GetParam(), frame, map, {120, 180, 210}, 20, 14, ignored);
-}
-
-TEST_P(FullPrecisionRecovery, SizesUpTo40InEveryMood) {
-  Random random(test_seed());
-  for (int half = 1; half <= 20; ++half)
-    for (const TransmissionMood mood : kTransmissionMoods) {
-      const int other = 2 * random.between(1, 20);
-      compare(
-          GetParam(), make_frame(random, random.one_of(kMoods), Colours::kWild, 2 * half, other),
-          make_transmissions(random, mood, 2 * half, other), random_light(random), 2 * half, other);
-      compare(
-          GetParam(), make_frame(random, random.one_of(kMoods), Colours::kWild, other, 2 * half),
-          make_transmissions(random, mood, other, 2 * half), random_light(random), other, 2 * half);
-    }
-}
-
-// Every length of what is left over by steps of vectors.
-TEST_P(FullPrecisionRecovery, WidthsUpTo200) {
-  Random random(test_seed());
-  for (int half = 1; half <= 100; ++half) {
-    const int width = 2 * half;
-    const int height = 2 * random.between(1, 3);
-    const TransmissionMood mood = random.one_of(kTransmissionMoods);
-    compare(GetParam(), make_frame(random, random.one_of(kMoods), Colours::kWild, width, height),
-            make_transmissions(random, mood, width, height), random_light(random), width, height);
-  }
-}
-
-// Frames of one block and of one block row or column hold nothing but edges.
-TEST_P(FullPrecisionRecovery, SmallestFrames) {
-  Random random(test_seed());
-  const int sizes[][2] = {{2, 2}, {4, 2}, {2, 4}, {4, 4}, {2, 12}, {12, 2}};
-  for (const auto& size : sizes)
-    for (const TransmissionMood mood : kTransmissionMoods)
-      for (int i = 0; i < 20; ++i)
-        compare(GetParam(), make_frame(random, Mood::kNoise, Colours::kWild, size[0], size[1]),
-                make_transmissions(random, mood, size[0], size[1]), random_light(random), size[0],
-                size[1]);
-}
-
-TEST_P(FullPrecisionRecovery, FrameSizes) {
-  Random random(test_seed());
-  const int sizes[][2] = {{640, 360}, {1280, 720}, {2, 720}, {1280, 2}};
-  for (const auto& size : sizes)
-    compare(GetParam(), make_hazy_frame(random, size[0], size[1]),
-            make_transmissions(random, TransmissionMood::kUsual, size[0], size[1]),
-            random_light(random), size[0], size[1]);
-}
-
-// Whole steps of a walk in groups of blocks, and a few more or less.
-TEST_P(FullPrecisionRecovery, WidthsAroundPowersOf2) {
-  Random random(test_seed());
-  for (const int power : {64, 128, 256, 512, 1024})
-    for (const int width : {power - 2, power, power + 2, power + 4})
-      compare(GetParam(), make_frame(random, Mood::kNoise, Colours::kWild, width, 6),
-              make_transmissions(random, TransmissionMood::kUsual, width, 6), random_light(random),
-              width, 6);
-}
-
-TEST_P(FullPrecisionRecovery, EmptySizesWriteNothing) {
-  Map map(256, 0.5f);
-  Light light = grey_light(100);
-  const int sizes[][2] = {{0, 0},   {0, 2},       {2, 0},       {-2, 2},  {2, -2}, {-2, -2},
-                          {-8, -8}, {INT_MIN, 2}, {2, INT_MIN}, {-16, 4}, {4, -16}};
-  for (const auto& size : sizes) {
-    GuardedBuffer<uint8_t> frame(1200, 60);
-    GetParam().recover(frame.data() + 600, map.data() + 128, light.data(), size[0], size[1], 0);
-    EXPECT_TRUE(all_bytes_are(frame, 60, {{"width", size[0]}, {"height", size[1]}}));
-  }
-}
-
-TEST_P(FullPrecisionRecovery, TouchesNothingPastTheFrame) {
-  Random random(test_seed());
-  for (int half_width = 1; half_width <= 70; ++half_width) {
-    const int width = 2 * half_width;
-    const Frame content = make_frame(random, Mood::kNoise, Colours::kWild, width, 6);
-    const Map map = make_transmissions(random, TransmissionMood::kUsual, width, 6);
-    PageEndBuffer<uint8_t> frame(content);
-    PageEndBuffer<float> transmission(map);
-    PageEndBuffer<uint8_t> light(Frame{90, 180, 200});
-    Frame want = content;
-    GetParam().reference(want.data(), map.data(), light.data(), width, 6);
-    GetParam().recover(frame.data(), transmission.data(), light.data(), width, 6, 0);
-    EXPECT_TRUE(bytes_match(frame, want, {{"width", width}}));
-  }
-}
-
-TEST(FullPrecisionRecoveryThreads, IndependentCalls) {
-  Random random(test_seed());
-  struct Job {
-    PlanarMember member;
-    Frame frame;
-    Map map;
-    Light light;
-  };
-  std::vector<Job> jobs;
-  for (const PlanarMember& member : {kAnchors, kInteger, kSingle, kInteger})
-    jobs.push_back({member, make_frame(random, Mood::kNoise, Colours::kWild, 64, 64),
-                    make_transmissions(random, TransmissionMood::kUsual, 64, 64),
-                    random_light(random)});
-  std::vector<Job> running = jobs;
-  std::vector<std::thread> threads;
-  for (Job& job : running)
-    threads.emplace_back([&job] {
-      job.member.recover(job.frame.data(), job.map.data(), job.light.data(), 64, 64, 0);
-    });
-  for (std::thread& thread : threads) thread.join();
-  for (size_t i = 0; i < jobs.size(); ++i) {
-    Job& job = jobs[i];
-    job.member.reference(job.frame.data(), job.map.data(), job.light.data(), 64, 64);
-    EXPECT_TRUE(bytes_match(running[i].frame, job.frame)) << job.member.name;
-  }
 }
 
 }  // namespace

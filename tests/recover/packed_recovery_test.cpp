@@ -12,6 +12,7 @@
 #include "tests/support/moods.h"
 #include "tests/support/random.h"
 #include "tests/support/recovery_inputs.h"
+#include "tests/support/recovery_sweeps.h"
 
 namespace haze::test {
 namespace {
@@ -93,28 +94,18 @@ TEST(PackedRecovery, ChromaOfOddRowsIsNotRead) {
 
 TEST(PackedRecovery, SizesUpTo40InEveryMood) {
   Random random(test_seed());
-  for (int half = 1; half <= 20; ++half)
-    for (const TransmissionMood mood : kTransmissionMoods) {
-      const int other = 2 * random.between(1, 20);
-      compare(make_packed(random, random.one_of(kMoods), 2 * half, other),
-              make_transmissions(random, mood, 2 * half, other), random_light(random), 2 * half,
-              other);
-      compare(make_packed(random, random.one_of(kMoods), other, 2 * half),
-              make_transmissions(random, mood, other, 2 * half), random_light(random), other,
-              2 * half);
-    }
+  for_sizes_up_to_40(random, [&](const Map& map, int width, int height) {
+    compare(make_packed(random, random.one_of(kMoods), width, height), map, random_light(random),
+            width, height);
+  });
 }
 
-// Every length of what is left over by steps of vectors.
 TEST(PackedRecovery, WidthsUpTo200) {
   Random random(test_seed());
-  for (int half = 1; half <= 100; ++half) {
-    const int width = 2 * half;
-    const int height = 2 * random.between(1, 3);
-    const TransmissionMood mood = random.one_of(kTransmissionMoods);
-    compare(make_packed(random, random.one_of(kMoods), width, height),
-            make_transmissions(random, mood, width, height), random_light(random), width, height);
-  }
+  for_widths_up_to_200(random, [&](const Map& map, int width, int height) {
+    compare(make_packed(random, random.one_of(kMoods), width, height), map, random_light(random),
+            width, height);
+  });
 }
 
 TEST(PackedRecovery, SmallestFrames) {

@@ -12,8 +12,8 @@
 #include "tests/reference/tone_curve.h"
 #include "tests/support/bytes_match.h"
 #include "tests/support/float_planes.h"
+#include "tests/support/float_recovery.h"
 #include "tests/support/moods.h"
-#include "tests/support/planar_recovery.h"
 #include "tests/support/random.h"
 #include "tests/support/recovery_inputs.h"
 
@@ -24,7 +24,7 @@ using Frame = std::vector<uint8_t>;
 using Map = std::vector<float>;
 using reference::kToneCurve;
 
-class ReciprocalIndex : public ::testing::TestWithParam<PlanarMember> {};
+class ReciprocalIndex : public ::testing::TestWithParam<FloatRecovery> {};
 
 INSTANTIATE_TEST_SUITE_P(Members, ReciprocalIndex, ::testing::Values(kAnchors, kInteger, kSingle),
                          [](const auto& member) { return std::string(member.param.name); });

@@ -14,6 +14,7 @@
 #include "tests/support/moods.h"
 #include "tests/support/random.h"
 #include "tests/support/recovery_inputs.h"
+#include "tests/support/recovery_sweeps.h"
 
 namespace haze::test {
 namespace {
@@ -84,28 +85,18 @@ TEST(StripeRecovery, IsTheAnchorRecoveryOfAFrame) {
 
 TEST(StripeRecovery, SizesUpTo40InEveryMood) {
   Random random(test_seed());
-  for (int half = 1; half <= 20; ++half)
-    for (const TransmissionMood mood : kTransmissionMoods) {
-      const int other = 2 * random.between(1, 20);
-      compare(make_frame(random, random.one_of(kMoods), Colours::kWild, 2 * half, other),
-              make_transmissions(random, mood, 2 * half, other), random_yuv(random), 2 * half,
-              other);
-      compare(make_frame(random, random.one_of(kMoods), Colours::kWild, other, 2 * half),
-              make_transmissions(random, mood, other, 2 * half), random_yuv(random), other,
-              2 * half);
-    }
+  for_sizes_up_to_40(random, [&](const Map& map, int width, int height) {
+    compare(make_frame(random, random.one_of(kMoods), Colours::kWild, width, height), map,
+            random_yuv(random), width, height);
+  });
 }
 
-// Every length of what is left over by steps of vectors.
 TEST(StripeRecovery, WidthsUpTo200) {
   Random random(test_seed());
-  for (int half = 1; half <= 100; ++half) {
-    const int width = 2 * half;
-    const int height = 2 * random.between(1, 3);
-    const TransmissionMood mood = random.one_of(kTransmissionMoods);
-    compare(make_frame(random, random.one_of(kMoods), Colours::kWild, width, height),
-            make_transmissions(random, mood, width, height), random_yuv(random), width, height);
-  }
+  for_widths_up_to_200(random, [&](const Map& map, int width, int height) {
+    compare(make_frame(random, random.one_of(kMoods), Colours::kWild, width, height), map,
+            random_yuv(random), width, height);
+  });
 }
 
 TEST(StripeRecovery, FrameSizes) {

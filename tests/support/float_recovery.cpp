@@ -1,20 +1,22 @@
-#include "tests/support/planar_recovery.h"
+#include "tests/support/float_recovery.h"
 
 #include <gtest/gtest.h>
 
 #include "haze_preview.h"
 #include "tests/reference/reciprocal_recovery.h"
+#include "tests/reference/recovery_variants.h"
 #include "tests/support/bytes_match.h"
 #include "tests/support/float_planes.h"
 #include "tests/support/guarded_buffer.h"
 
 namespace haze::test {
 
-const PlanarMember kAnchors = {"Anchors", HazeRemovingPreview, reference::recover_anchors};
-const PlanarMember kInteger = {"Integer", HazeRemoving1Preview, reference::recover_each_integer};
-const PlanarMember kSingle = {"Single", HazeRemoving2Preview, reference::recover_each_single};
+const FloatRecovery kAnchors = {"Anchors", HazeRemovingPreview, reference::recover_anchors};
+const FloatRecovery kInteger = {"Integer", HazeRemoving1Preview, reference::recover_each_integer};
+const FloatRecovery kSingle = {"Single", HazeRemoving2Preview, reference::recover_each_single};
+const FloatRecovery kNv21 = {"Nv21", HazeRemoving3Preview_NV21_f, reference::recover_nv21_float};
 
-void compare(const PlanarMember& member, const std::vector<uint8_t>& frame,
+void compare(const FloatRecovery& member, const std::vector<uint8_t>& frame,
              const std::vector<float>& map, const Light& light, int width, int height,
              int ignored) {
   std::vector<uint8_t> want = frame;
@@ -36,7 +38,7 @@ void compare(const PlanarMember& member, const std::vector<uint8_t>& frame,
   ASSERT_TRUE(bytes_match(light_bgr, light));
 }
 
-std::vector<uint8_t> run(const PlanarMember& member, std::vector<uint8_t> frame,
+std::vector<uint8_t> run(const FloatRecovery& member, std::vector<uint8_t> frame,
                          std::vector<float> map, Light light, int width, int height) {
   member.recover(frame.data(), map.data(), light.data(), width, height, 0);
   return frame;

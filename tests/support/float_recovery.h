@@ -1,4 +1,4 @@
-// The three recoveries of planar frames by reciprocals, each beside its definition.
+// The recoveries of frames by maps of float transmissions, each beside its definition.
 #pragma once
 
 #include <cstddef>
@@ -9,23 +9,24 @@
 
 namespace haze::test {
 
-struct PlanarMember {
+struct FloatRecovery {
   const char* name;
   void (*recover)(unsigned char*, float*, unsigned char*, int, int, int);
   void (*reference)(uint8_t*, const float*, const uint8_t*, int, int);
 };
 
-extern const PlanarMember kAnchors;  // HazeRemovingPreview
-extern const PlanarMember kInteger;  // HazeRemoving1Preview
-extern const PlanarMember kSingle;   // HazeRemoving2Preview
+extern const FloatRecovery kAnchors;  // HazeRemovingPreview
+extern const FloatRecovery kInteger;  // HazeRemoving1Preview
+extern const FloatRecovery kSingle;   // HazeRemoving2Preview
+extern const FloatRecovery kNv21;     // HazeRemoving3Preview_NV21_f, the only one of NV21 frames
 
 // Frame, map and light in buffers of their exact sizes, against the reference.
-void compare(const PlanarMember& member, const std::vector<uint8_t>& frame,
+void compare(const FloatRecovery& member, const std::vector<uint8_t>& frame,
              const std::vector<float>& map, const Light& light, int width, int height,
              int ignored = 0);
 
 // The recovered frame.
-std::vector<uint8_t> run(const PlanarMember& member, std::vector<uint8_t> frame,
+std::vector<uint8_t> run(const FloatRecovery& member, std::vector<uint8_t> frame,
                          std::vector<float> map, Light light, int width, int height);
 
 // A frame that holds every byte value four times in luma, and in each chroma plane in opposite
