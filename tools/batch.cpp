@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <chrono>
+#include <cmath>
 #include <cstdio>
 #include <filesystem>
 #include <list>
@@ -152,9 +153,9 @@ class Batch {
                   plan_.files.size(), static_cast<int>(share * 100));
     std::string line = text;
     if (share > 0) {
-      const double left = seconds * (1 - share) / share;
+      const int64_t left = std::llround(seconds * (1 - share) / share);
       std::snprintf(text, sizeof(text), ", %.1f files/min, %s left", share * total * 60 / seconds,
-                    duration_text(static_cast<int64_t>(left + 0.5)).c_str());
+                    duration_text(left).c_str());
       line += text;
     }
     const char* separator = "; ";

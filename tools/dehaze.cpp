@@ -30,7 +30,7 @@ ExitStatus run_single(const Options& options) {
     print_line(frames_on_stdout ? stderr : stdout, to_json(result));
     if (frames_on_stdout) return result.exit_status;
   }
-  if (result.status != FileStatus::kDone) {
+  if (!result.outcome) {
     print_error(result.message);
     return result.exit_status;
   }
@@ -38,7 +38,7 @@ ExitStatus run_single(const Options& options) {
     print_line(stdout, describe(result.outcome->report.findings));
   }
   // Asked for by name, so not subject to --quiet.
-  if (options.timing) print_info(timing_text(result));
+  if (options.timing) print_info(timing_text(*result.outcome));
   return kExitDone;
 }
 

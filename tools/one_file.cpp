@@ -68,8 +68,8 @@ FileResult process_file(const Options& options, Console& console) {
   return result;
 }
 
-std::string timing_text(const FileResult& result) {
-  return "time per frame: " + describe(result.outcome->report.times);
+std::string timing_text(const Outcome& outcome) {
+  return "time per frame: " + describe(outcome.report.times);
 }
 
 }  // namespace dehaze

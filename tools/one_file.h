@@ -14,7 +14,7 @@ namespace dehaze {
 FileResult process_file(const Options& options, Console& console);
 
 // What --timing asks for.
-std::string timing_text(const FileResult& result);
+std::string timing_text(const Outcome& outcome);
 
 }  // namespace dehaze
 

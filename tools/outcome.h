@@ -29,7 +29,7 @@ struct FileResult {
   ExitStatus exit_status = kExitFailed;  // that this file alone would give
   std::string message;                   // why it was skipped or failed
   std::vector<std::string> notes;
-  std::optional<Outcome> outcome;
+  std::optional<Outcome> outcome;  // if it was done
   double seconds = 0;
 };
 

@@ -63,14 +63,14 @@ class WorkerConsole : public Console {
 int work(const Options& options, const WorkerConsole& sender, Console& console) {
   const FileResult result = process_file(options, console);
   if (options.json) sender.send(kJson, to_json(result));
-  if (result.status != FileStatus::kDone) {
+  if (!result.outcome) {
     sender.send(kFailed, result.message);
     return kExitFailed;
   }
   if (options.engine.show == Show::kLight && !options.json) {
     sender.send(kPrint, describe(result.outcome->report.findings));
   }
-  if (options.timing) sender.send(kInfo, timing_text(result));
+  if (options.timing) sender.send(kInfo, timing_text(*result.outcome));
   sender.send(kDone, "");
   return kExitDone;
 }
