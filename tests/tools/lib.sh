@@ -28,6 +28,31 @@ make_video() { # FILE SIZE SECONDS [FFMPEG_OPTION...]
     -vf "$kHaze,format=yuv420p" -c:v libx264 -preset ultrafast -c:a aac -shortest "${@:4}" "$1"
 }
 
+# exif_jpeg IN OUT ORIENTATION: puts an EXIF segment with nothing but the orientation after the
+# start of the JPEG file.
+exif_jpeg() {
+  {
+    head -c 2 "$1"
+    printf '\xff\xe1\x00\x22Exif\0\0MM\0\x2a\0\0\0\x08\0\x01\x01\x12\0\x03\0\0\0\x01\0'
+    printf "\\x0$3\\0\\0\\0\\0\\0\\0"
+    tail -c +3 "$1"
+  } >"$2"
+}
+
+# profile_jpeg IN OUT: puts in a segment that is an ICC profile by its label; its content is carried,
+# not read.
+profile_jpeg() {
+  {
+    head -c 2 "$1"
+    printf '\xff\xe2\x00\x90ICC_PROFILE\0\x01\x01'
+    head -c 128 /dev/zero | tr '\0' 'p'
+    tail -c +3 "$1"
+  } >"$2"
+}
+has_profile() {
+  ffprobe -v error -show_frames "$1" | holds 'ICC profile' || fail "no colour profile in $1"
+}
+
 dehaze() { "$DEHAZE" "$@" 2>messages || fail "dehaze $* ended with $?: $(cat messages)"; }
 
 # dehaze_fails STATUS PATTERN ARGUMENT...: it must end with that status and a message like that.

@@ -4,17 +4,6 @@ source "$(dirname "$0")/lib.sh"
 
 tag_of() { ffprobe -v error -show_entries "frame_tags=$2" -of csv=p=0 "$1"; }
 
-# exif_jpeg IN OUT ORIENTATION: puts an EXIF segment with nothing but the orientation after the
-# start of the JPEG file.
-exif_jpeg() {
-  {
-    head -c 2 "$1"
-    printf '\xff\xe1\x00\x22Exif\0\0MM\0\x2a\0\0\0\x08\0\x01\x01\x12\0\x03\0\0\0\x01\0'
-    printf "\\x0$3\\0\\0\\0\\0\\0\\0"
-    tail -c +3 "$1"
-  } >"$2"
-}
-
 # At a level nothing is judged. Left to itself, the tool looks for the light where up is.
 case_exif_orientation() {
   make_picture plain.jpg 321x200 yuvj420p
@@ -34,18 +23,12 @@ case_exif_orientation() {
 
 case_color_profile() {
   make_picture plain.jpg 160x160 yuvj420p
-  # A segment that is a profile by its label; its content is carried, not read.
-  {
-    head -c 2 plain.jpg
-    printf '\xff\xe2\x00\x90ICC_PROFILE\0\x01\x01'
-    head -c 128 /dev/zero | tr '\0' 'p'
-    tail -c +3 plain.jpg
-  } >in.jpg
+  profile_jpeg plain.jpg in.jpg
   local kind
   for kind in jpg png webp; do
     dehaze in.jpg "out.$kind"
     says_nothing
-    ffprobe -v error -show_frames "out.$kind" | holds 'ICC profile' || fail "no profile in $kind"
+    has_profile "out.$kind"
   done
 }
 

@@ -196,6 +196,21 @@ case_orientation_and_odd_size() {
   equal "$(stream picture_1.jpg v width,height)" 321,201
 }
 
+case_camera_picture() {
+  make_picture plain.jpg 320x200 yuvj420p
+  exif_jpeg plain.jpg turned.jpg 6
+  profile_jpeg turned.jpg in.jpg
+  make_input -i plain.jpg -vf transpose=clock want.png
+  report in.jpg --reference want.png -o out.html
+  picture_of out.html 1
+  picture_of out.html 2
+  equal "$(stream picture_1.jpg v width,height)" 200,320
+  close_pictures want.png picture_2.jpg 28
+  # The colours mean the same in the page.
+  has_profile picture_1.jpg
+  has_profile picture_2.jpg
+}
+
 case_long_pixels() {
   make_input -f lavfi -i "testsrc2=size=320x240:duration=0.2" -vf setsar=2/1,format=yuv420p \
     -c:v libx264 -preset ultrafast in.mp4
