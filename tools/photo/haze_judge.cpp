@@ -26,6 +26,9 @@ constexpr double kLargestLeastTransmission = 0.35;
 constexpr double kSecondsOfMemory = 2;
 constexpr double kUsualRate = 25;
 
+// The first frame is what everybody has seen: the next ones should not pull away from it.
+constexpr double kFirstValueCounts = 8;
+
 // Mean change of a sample from one frame to the next.
 constexpr double kCut = 30;
 
@@ -48,7 +51,7 @@ double hazy(const Plane& share) {
 }  // namespace
 
 void SteadyValue::add(double value, double memory) {
-  count_ = std::min(count_ + 1, std::max(memory, 1.0));
+  count_ = count_ == 0 ? 1 : std::min(std::max(count_, kFirstValueCounts) + 1, memory);
   mean_ += (value - mean_) / count_;
 }
 
@@ -60,7 +63,8 @@ double Removal::transmission(double share) const {
 HazeJudge::HazeJudge(std::optional<int> strength, double frames_per_second,
                      const Orientation& orientation)
     : strength_(strength),
-      memory_(kSecondsOfMemory * (frames_per_second > 0 ? frames_per_second : kUsualRate)),
+      memory_(kFirstValueCounts +
+              kSecondsOfMemory * (frames_per_second > 0 ? frames_per_second : kUsualRate)),
       orientation_(orientation) {}
 
 bool HazeJudge::is_cut(const BgrImage& small) const {

@@ -7,10 +7,10 @@ namespace dehaze {
 namespace {
 
 // Weight of a new frame where the picture stands still.
-constexpr float kLeastWeight = 0.08F;
+constexpr float kLeastWeight = 0.05F;
 
 // Mean change of a pixel's three samples that noise explains, and one that only movement does.
-constexpr float kNoise = 6;
+constexpr float kNoise = 9;
 constexpr float kMovement = 24;
 
 float weight_of_change(float change) {
