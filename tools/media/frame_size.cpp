@@ -45,10 +45,9 @@ FrameSize whole_frame_size(int width, int height) {
                 text(kMinPhotoSide, kMinPhotoSide) + ", so enlarge it first");
   }
   const int64_t pixels = static_cast<int64_t>(width) * height;
-  if (width > kMaxPhotoSide || height > kMaxPhotoSide ||
-      pixels > kMaxPhotoMegapixels * int64_t{1000000} + 217728) {
+  if (width > kMaxPhotoSide || height > kMaxPhotoSide || pixels > kMaxPhotoPixels) {
     throw Error("the picture is " + text(width, height) + "; it may have at most " +
-                std::to_string(kMaxPhotoMegapixels) + " megapixels and no side above " +
+                std::to_string(kMaxPhotoPixels / 1000000) + " megapixels and no side above " +
                 std::to_string(kMaxPhotoSide) + ", so reduce it first");
   }
   return {width, height, width, height};

@@ -2,6 +2,8 @@
 #ifndef TOOLS_MEDIA_FRAME_SIZE_H
 #define TOOLS_MEDIA_FRAME_SIZE_H
 
+#include <cstdint>
+
 namespace dehaze {
 
 // Limits of the library's frame path, which is the preview engine.
@@ -13,7 +15,7 @@ constexpr int kMinFrameSide = 128;
 // 4 x 4 samples, which a guided filter needs; sizes in bytes have to fit 32-bit arithmetic.
 constexpr int kMinPhotoSide = 8;
 constexpr int kMaxPhotoSide = 32768;
-constexpr int kMaxPhotoMegapixels = 134;  // 8192 x 16384
+constexpr int64_t kMaxPhotoPixels = int64_t{8192} * 16384;
 
 struct FrameSize {
   int source_width;

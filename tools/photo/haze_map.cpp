@@ -104,8 +104,8 @@ DarkShares dark_shares(BgrImage& image, Light light) {
   return shares;
 }
 
-// Composed from the float box filters instead of GuidedFilterPreview for its 8-bit codes end at a
-// transmission of 0.2 and would be amplified; README.md has the comparison.
+// Composed of the float box filters: the codes of GuidedFilterPreview end at a transmission of 0.2,
+// and its result cannot be taken to another size. docs/quality.md has the comparison.
 GuidedModel fit_to_guide(Plane& plane, Plane& guide) {
   const int w = plane.width;
   const int h = plane.height;
