@@ -7,8 +7,8 @@
 
 namespace {
 
-// Converts `rows` row pairs of an NV21 frame into rows of `blocks` pixels, of which `whole` have two
-// columns; `luma_step` bytes lie between row pairs.
+// Converts `rows` row pairs of an NV21 frame into rows of `blocks` pixels, of which `whole` have
+// two columns; `luma_step` bytes lie between row pairs.
 void convert_nv21(const uint8_t* luma, const uint8_t* vu, uint8_t* bgr, int blocks, int whole,
                   int rows, ptrdiff_t luma_step) {
   for (int y = 0; y < rows; ++y) {

@@ -20,8 +20,8 @@ inline float clamped_transmission(float scale, uint8_t byte) {
 }
 
 #if HAZE_NEON
-// The largest clamped transmission of byte k of each word of the three channels. Transmissions never
-// rise with the product, so the least product gives the largest one. They cannot exceed 1.
+// The largest clamped transmission of byte k of each word of the three channels. Transmissions
+// never rise with the product, so the least product gives the largest one. They cannot exceed 1.
 template <int kByte>
 inline float32x4_t largest_transmission_neon(const uint8x16x3_t& pixels,
                                              const float32x4_t (&scales)[3]) {

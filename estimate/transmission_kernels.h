@@ -106,7 +106,8 @@ inline void look_up_codes(const uint8_t* mean, const uint8_t* minimum, uint8_t* 
 }
 
 #if HAZE_NEON
-// Whether t is a number that cannot exceed 1 whatever the pixel. Then codes may be clamped as bytes.
+// Whether t is a number that cannot exceed 1 whatever the pixel. Then codes may be clamped as
+// bytes.
 constexpr bool keeps_below_one(GroupArguments arguments) {
   return arguments.strength >= 0.0f && arguments.strength <= FLT_MAX &&
          arguments.minus_inv_a <= 0.0f && arguments.minus_inv_a >= -FLT_MAX;
@@ -119,9 +120,9 @@ struct GroupVectors {
   float32x4_t minus_inv_a;
 };
 
-// trunc(200 t) of byte k of each word. With kClampsFloats t is clamped: vmin and vmax hand on a value
-// that is not a number, and the conversion turns it into 0. Otherwise t is at most 1, and negative
-// products become 0.
+// trunc(200 t) of byte k of each word. With kClampsFloats t is clamped: vmin and vmax hand on a
+// value that is not a number, and the conversion turns it into 0. Otherwise t is at most 1, and
+// negative products become 0.
 template <int kByte, bool kClampsFloats>
 inline uint32x4_t scaled_transmission_neon(uint8x16_t means, uint8x16_t minima,
                                            GroupVectors arguments) {

@@ -18,8 +18,8 @@ using haze::filter::Reach;
 using haze::filter::Reciprocals64;
 
 #if HAZE_X86
-// Means of the windows of `reach` by prefix sums, in vectors. In a function of its own for the sake of the stack: a row's
-// working memory takes some 46 KiB.
+// Means of the windows of `reach` by prefix sums, in vectors. In a function of its own for the sake
+// of the stack: a row's working memory takes some 46 KiB.
 template <typename Sum, typename Kernel>
 __attribute__((noinline)) void average_by_prefixes(const uint8_t* src, uint8_t* dst, int width,
                                                    int height, Reach reach, Sum* scratch,

@@ -1,5 +1,5 @@
-// Row kernels of the integer box filters on NEON. Each returns the first column or pixel that it did
-// not touch.
+// Row kernels of the integer box filters on NEON. Each returns the first column or pixel that it
+// did not touch.
 #pragma once
 
 #include <stdint.h>
@@ -17,8 +17,8 @@ inline void accumulate_neon(int32_t* sums, int16x8_t change) {
   vst1q_s32(sums + 4, vaddw_s16(vld1q_s32(sums + 4), vget_high_s16(change)));
 }
 
-// Each change of column sums, sixteen columns a step. Whole registers are loaded because Clang takes
-// eight-byte loads that are widened through the stack.
+// Each change of column sums, sixteen columns a step. Whole registers are loaded because Clang
+// takes eight-byte loads that are widened through the stack.
 //
 // sums[x] += entering[x] - leaving[x]. The differences wrap as unsigned and read back as signed.
 template <typename Sum>
@@ -84,8 +84,8 @@ inline uint8x8_t means_64_neon(int32x4_t low, int32x4_t high, int16x8_t reciproc
 }
 
 // Means of windows of 64 columns that move on by one column per pixel, 32 pixels a step: `sum` is
-// the window's before the first of them; entering[x] and leaving[x] are the column sums that pixel x
-// adds and drops. Returns the first pixel that it did not write, and leaves the sum of the pixel
+// the window's before the first of them; entering[x] and leaving[x] are the column sums that pixel
+// x adds and drops. Returns the first pixel that it did not write, and leaves the sum of the pixel
 // before it.
 //
 // The loads deal four neighbouring pixels out to four vectors, so that seven of eight additions of
@@ -126,8 +126,8 @@ inline int mean_windows_64_neon(const int16_t* entering, const int16_t* leaving,
 
 // Division of window sums below 2^24 by their count of 2 ... 2^16 pixels.
 //
-// With 2^s < count <= 2^(s + 1) and m = (2^(31 + s) + e) / count, 0 < e <= 2 * count, the quotient is
-// sum * m >> (31 + s): the error is sum * e / 2^(31 + s) < 2^(24 + 1 + s + 1 - 31 - s) = 2^-5 of
+// With 2^s < count <= 2^(s + 1) and m = (2^(31 + s) + e) / count, 0 < e <= 2 * count, the quotient
+// is sum * m >> (31 + s): the error is sum * e / 2^(31 + s) < 2^(24 + 1 + s + 1 - 31 - s) = 2^-5 of
 // 1 / count. Sums come scaled by 2^(16 - s), which leaves them below 255 * 2^17, so that vqdmulh,
 // which shifts by 31, puts the quotient above 16 bits of fraction.
 struct CountNeon {

@@ -67,8 +67,8 @@ struct MostFloat {
   }
 #elif HAZE_NEON
   // NEON of 32-bit ARM compares numbers below the normal range as zeros, hence by their bits: as
-  // integers, floats are in order, or in reverse order where both are negative. Zeros of either sign
-  // are equal.
+  // integers, floats are in order, or in reverse order where both are negative. Zeros of either
+  // sign are equal.
   static constexpr size_t kLanes = 4;
   static void combine_lanes(const Value* earlier, const Value* later, Value* to) {
     const int32x4_t a = vreinterpretq_s32_f32(vld1q_f32(earlier));

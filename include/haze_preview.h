@@ -499,9 +499,10 @@ extern HAZE_PREVIEW_API unsigned char gCalMaxMaxA[8];
 HAZE_PREVIEW_API void EstimateTPreview(unsigned char* src, unsigned char* A, float* t, float* tRaw,
                                        int w, int h, int level);
 
-// Maximum over the samples i - r ... i + r of a line of n contiguous floats as far as they exist; of
-// equal samples (zeros of either sign) the last. Samples must be numbers. Output i goes to
-// dst[i * dstStride]. Sizes below 1, negative radii and failed allocations write nothing. Reentrant.
+// Maximum over the samples i - r ... i + r of a line of n contiguous floats as far as they exist;
+// of equal samples (zeros of either sign) the last. Samples must be numbers. Output i goes to
+// dst[i * dstStride]. Sizes below 1, negative radii and failed allocations write nothing.
+// Reentrant.
 HAZE_PREVIEW_API void getMaxChannelPreview(float* src, float* dst, int n, int dstStride, int r);
 
 // The same with outputs side by side; `rows` has no effect. Reentrant.

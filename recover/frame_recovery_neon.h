@@ -97,8 +97,8 @@ inline void store_chroma_neon(uint8x8_t vu, uint8_t* v, uint8_t* u) {
   }
 }
 
-// A row of 2 x 2 blocks, for every code, four blocks a step; returns the first block that it did not
-// recover.
+// A row of 2 x 2 blocks, for every code, four blocks a step; returns the first block that it did
+// not recover.
 template <ChromaLayout kLayout>
 inline int recover_blocks_neon(BlockRow row, const uint8_t* codes, int blocks, LightAnchor anchor,
                                const uint8_t* tone_curve) {

@@ -12,8 +12,8 @@ namespace haze::recover {
 //
 //   base[h] + ((step[h] * (x + 184) mod 256 + 64) >> 7)
 //
-// modulo 256. The byte product wraps, so a step sets where in its eight inputs the line moves on, by
-// one at most: the constants were found by trying all of them. The tests hold every byte against
+// modulo 256. The byte product wraps, so a step sets where in its eight inputs the line moves on,
+// by one at most: the constants were found by trying all of them. The tests hold every byte against
 // the curve. The darkest 24 inputs are taken from the curve itself.
 inline constexpr uint8_t kToneSteps[32] = {0,   0,   0,   32,  32,  11,  20,  14,  0,   11, 0,
                                            234, 0,   0,   240, 0,   237, 242, 247, 0,   0,  242,

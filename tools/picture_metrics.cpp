@@ -19,7 +19,8 @@ constexpr double kLeastChroma = 0.1;
 
 using Plane = std::vector<double>;
 
-// Rows of windows that are worked on at a time: the planes of a large picture would fill the memory.
+// Rows of windows that are worked on at a time: the planes of a large picture would fill the
+// memory.
 constexpr size_t kBandRows = 256;
 
 // Of `rows` rows from `first_row` on.

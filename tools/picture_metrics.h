@@ -24,8 +24,9 @@ double ssim_luma(const RgbPicture& a, const RgbPicture& b);
 // Mean CIEDE2000 colour difference over all pixels.
 double mean_ciede2000(const RgbPicture& a, const RgbPicture& b);
 
-// Mean angle in degrees between the L*a*b* hues of `picture` and `reference`, each pixel weighted by
-// the reference's chroma, so that greys, whose hue is chance, do not count. 0 if all of it is grey.
+// Mean angle in degrees between the L*a*b* hues of `picture` and `reference`, each pixel weighted
+// by the reference's chroma, so that greys, whose hue is chance, do not count. 0 if all of it is
+// grey.
 double mean_hue_shift(const RgbPicture& reference, const RgbPicture& picture);
 
 // Share of the pixels, 0 ... 1, with a channel at 0 or 255.

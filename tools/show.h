@@ -14,7 +14,8 @@ namespace dehaze {
 // transmission: (width / 2) x (height / 2) values in [0, 1].
 void draw_map(const std::vector<float>& transmission, Nv21Frame& frame);
 
-// One view, split in the middle by a thin white line: the left half of `before` is put over `frame`.
+// One view, split in the middle by a thin white line: the left half of `before` is put over
+// `frame`.
 void draw_compare(const Nv21Frame& before, Nv21Frame& frame);
 
 // "light 200 203 208 strength 64": red, green, blue.

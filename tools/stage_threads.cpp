@@ -51,8 +51,8 @@ void StageThreads::wait_for_end() {
     std::unique_lock<std::mutex> lock(mutex_);
     while (!ended_.wait_for(lock, kLookInterval, [this] { return running_ == 0; })) {
       if (!is_stopping()) continue;
-      // Signals reach one thread only, and a failure none: the others may wait for a pipe. Again and
-      // again, because a thread may be just about to begin to wait.
+      // Signals reach one thread only, and a failure none: the others may wait for a pipe. Again
+      // and again, because a thread may be just about to begin to wait.
       for (std::thread& thread : threads_) wake_thread(thread.native_handle());
       lock.unlock();
       cancel_();

@@ -35,8 +35,8 @@ class Worker {
   const std::string& failure() const { return failure_; }
   const std::string& json() const { return json_; }
 
-  // What is to be printed about the file, taken once: notes, what is printed in spite of --quiet, and
-  // what goes to standard output.
+  // What is to be printed about the file, taken once: notes, what is printed in spite of --quiet,
+  // and what goes to standard output.
   std::vector<std::string> take_notes();
   std::vector<std::string> take_infos();
   std::vector<std::string> take_output();

@@ -280,7 +280,8 @@ TEST(ThreadedChannelMaps, AllSlotsAtOnce) {
   }
 }
 
-// Runs one stripe of each family by hand-filled globals and compares whole maps, so that rows of other stripes show.
+// Runs one stripe of each family by hand-filled globals and compares whole maps, so that rows of
+// other stripes show.
 void expect_max_min_stripe(Random& random, int width, int height, int slot, int stripe) {
   std::vector<uint8_t> src = make_image(random, Mood::kNoise, 3 * width, height);
   GuardedBuffer<uint8_t> min_map(area(width, height), kUnwritten);

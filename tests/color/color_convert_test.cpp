@@ -69,7 +69,8 @@ Pixel convert_pixel(Convert convert, const Pixel& pixel) {
   return {alone[0], alone[1], alone[2]};
 }
 
-// All 2^24 pixels, 256 x 256 of them per call: the first byte by call, the others by row and column.
+// All 2^24 pixels, 256 x 256 of them per call: the first byte by call, the others by row and
+// column.
 void expect_every_pixel(Convert convert, const std::function<void(int, uint8_t*)>& define_slab) {
   constexpr int kSide = 256;
   std::vector<uint8_t> source(bytes_of(kSide, kSide, 3));

@@ -72,8 +72,8 @@ class FrameSizeGlobals {
   int height_;
 };
 
-// Converts a stripe of width x height whose frame has the given size. U and V stand in one buffer from the stripe's
-// first U to its last V, as they do in a frame.
+// Converts a stripe of width x height whose frame has the given size. U and V stand in one buffer
+// from the stripe's first U to its last V, as they do in a frame.
 void compare_planar(Random& random, Mood luma_mood, Mood chroma_mood, int width, int height,
                     int frame_width, int frame_height, size_t skew = 0) {
   const int half_width = (width + 1) / 2;
@@ -303,8 +303,8 @@ TEST(HalfResolutionBgr, ReadsNothingPastTheLastRows) {
   }
 }
 
-// An odd width ends in a block of one column, an odd height in one of one row: the image may end with
-// that byte, whole steps of blocks or not.
+// An odd width ends in a block of one column, an odd height in one of one row: the image may end
+// with that byte, whole steps of blocks or not.
 TEST(HalfResolutionBgr, OddSizesReadNothingPastTheLastLuma) {
   Random random(test_seed());
   for (int half_width = 1; half_width <= 200; ++half_width) {

@@ -41,8 +41,8 @@ void compare_light(const std::vector<uint8_t>& dark, const std::vector<uint8_t>&
       << width << " x " << height << ", seed " << test_seed();
 }
 
-// An image of `pixels` pixels whose dark channel holds the given bins and 0 elsewhere. All pixels of a bin have the
-// colour (bin, 255 - bin, 7), so that the light tells the bin.
+// An image of `pixels` pixels whose dark channel holds the given bins and 0 elsewhere. All pixels
+// of a bin have the colour (bin, 255 - bin, 7), so that the light tells the bin.
 struct BinnedImage {
   BinnedImage(int width, int height, const std::vector<std::array<int, 2>>& counts)
       : dark(area(width, height)), image(3 * dark.size()), bins(256) {

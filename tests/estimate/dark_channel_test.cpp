@@ -60,7 +60,8 @@ TEST(MinLine, EveryRadiusAndLength) {
                    radius);
 }
 
-// With few values minima are tied, so that the place of a tied one decides when a window is searched again.
+// With few values minima are tied, so that the place of a tied one decides when a window is
+// searched again.
 TEST(MinLine, EveryLineOfThreeValues) {
   constexpr int kCount = 8;
   for (int radius = 0; radius <= 4; ++radius)

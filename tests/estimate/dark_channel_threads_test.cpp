@@ -1,4 +1,5 @@
-// The square minimum filter by four threads: row stripes, then column stripes with a histogram each.
+// The square minimum filter by four threads: row stripes, then column stripes with a histogram
+// each.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -125,7 +126,8 @@ TEST(ThreadedDarkChannel, UnalignedStarts) {
     compare(make_image(random, Mood::kNoise, 37, 23), 37, 23, random.between(0, 8), 2, skew);
 }
 
-// Few values, so that minima are tied and the row that is remembered decides when a column is searched again.
+// Few values, so that minima are tied and the row that is remembered decides when a column is
+// searched again.
 TEST(ThreadedDarkChannel, TiedMinima) {
   Random random(test_seed());
   for (int i = 0; i < 40; ++i) {

@@ -1,5 +1,5 @@
-// The maximum of a window and the one that is carried from sample to sample are the same, down to the
-// sign of zeros.
+// The maximum of a window and the one that is carried from sample to sample are the same, down to
+// the sign of zeros.
 #include <gtest/gtest.h>
 
 #include <cstdint>

@@ -61,7 +61,8 @@ void fill_max_globals(uint8_t* plane_h, uint8_t* plane_a, int width, int height)
   gCalMaxHeight = height;
 }
 
-// Every stripe through the workers' inner functions, on planes that end at a page which may not be read.
+// Every stripe through the workers' inner functions, on planes that end at a page which may not be
+// read.
 void compare_stripes(Random& random, int width, int height) {
   PageEndBuffer<uint8_t> plane_h(make_image(random, random.one_of(kMoods), width, height));
   PageEndBuffer<uint8_t> plane_a(make_image(random, random.one_of(kMoods), width, height));
@@ -107,7 +108,8 @@ TEST(SampledStripes, OddStripesSampleOddRows) {
   }
 }
 
-// Rows 0 and 2 of the first stripe: the second of them is sampled at columns 1 and, in the row below, 0.
+// Rows 0 and 2 of the first stripe: the second of them is sampled at columns 1 and, in the row
+// below, 0.
 TEST(SampledStripes, OddWidthsDriftToTheRight) {
   std::vector<uint8_t> plane(area(3, 32), 100);
   plane[0] = 1;
@@ -124,7 +126,8 @@ TEST(SampledStripes, OddWidthsDriftToTheRight) {
   EXPECT_EQ(gCalMaxMaxA[0], 8);
 }
 
-// The last row of the last stripe starts one byte to the right, so that its last sample is past the plane.
+// The last row of the last stripe starts one byte to the right, so that its last sample is past the
+// plane.
 TEST(SampledStripes, SamplesPastThePlaneDoNotCount) {
   std::vector<uint8_t> plane(area(3, 31) + 3, 100);
   plane[3 * 28] = 1;

@@ -80,8 +80,8 @@ TEST(ZoomIn, RowsAreDoubledFirst) {
   const std::vector<float> doubled =
       zoomed_in({1.0f, 1.0f + ulp, 1.0f + 2 * ulp, 1.0f + 2 * ulp}, 2, 2);
   // The mean of 1 and 1 + ulp is a tie that rounds to 1, and the one of 1 and 1 + 2 ulp is 1 + ulp.
-  // By columns first it would be the mean of 1 + ulp and of 1 + 1.5 ulp, itself rounded to 1 + 2 ulp:
-  // a tie that rounds to 1 + 2 ulp.
+  // By columns first it would be the mean of 1 + ulp and of 1 + 1.5 ulp, itself rounded to 1 + 2
+  // ulp: a tie that rounds to 1 + 2 ulp.
   EXPECT_EQ(doubled[5], 1.0f + ulp);
 }
 

@@ -1,4 +1,5 @@
-// The atmospheric light of a dark-channel histogram, and statistics over every second row and column.
+// The atmospheric light of a dark-channel histogram, and statistics over every second row and
+// column.
 #pragma once
 
 #include <array>
@@ -7,16 +8,17 @@
 
 namespace haze::reference {
 
-// The most populated of the brightest bins that together hold 0.1 % of the pixels; the brighter one of equals.
+// The most populated of the brightest bins that together hold 0.1 % of the pixels; the brighter one
+// of equals.
 int brightest_populated_bin(const int* histogram, int pixels);
 
 // Mean colour, truncated, of the pixels whose dark channel is that bin; 255s if there are none.
 std::array<uint8_t, 3> estimate_light(const uint8_t* dark, const uint8_t* image,
                                       const int* histogram, int width, int height);
 
-// Calls visit(position) for each sampled byte of stripe 0 ... 7 of a plane. Every second row of the stripe is sampled;
-// the position runs on from the end of a scanned row, so that odd widths drift to the right. Positions past the
-// plane's end are left out.
+// Calls visit(position) for each sampled byte of stripe 0 ... 7 of a plane. Every second row of the
+// stripe is sampled; the position runs on from the end of a scanned row, so that odd widths drift
+// to the right. Positions past the plane's end are left out.
 template <class Visit>
 void for_each_sample(int width, int height, int stripe, const Visit& visit) {
   const int rows = (height + 7) / 8;

@@ -14,7 +14,8 @@ struct ImageRows {
 };
 constexpr ImageRows all_rows(int height) { return {0, height}; }
 
-// Rows that stripe 0 ... stripes - 1 covers: even counts but for the last one, which takes the rest.
+// Rows that stripe 0 ... stripes - 1 covers: even counts but for the last one, which takes the
+// rest.
 ImageRows even_stripe_rows(int height, int stripes, int stripe);
 
 // Maps of the given rows; either map may be null.

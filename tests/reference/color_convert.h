@@ -50,8 +50,8 @@ inline Bgr bgr_of_ycrcb(int y, int cr, int cb) {
 void bgr_to_ycrcb(const uint8_t* bgr, uint8_t* ycrcb, int width, int height);
 void ycrcb_to_bgr(const uint8_t* ycrcb, uint8_t* bgr, int width, int height);
 
-// Two bytes per pixel, Y before Cb (even columns) or Cr (odd ones); each 2 x 2 block has the clamped chroma of its
-// top-left pixel. At odd sizes the last blocks have a column or row less.
+// Two bytes per pixel, Y before Cb (even columns) or Cr (odd ones); each 2 x 2 block has the
+// clamped chroma of its top-left pixel. At odd sizes the last blocks have a column or row less.
 void bgr_to_two_bytes(const uint8_t* bgr, uint8_t* yc, int width, int height);
 
 // One pixel per 2 x 2 block, from the block's top-left luma; blocks at odd borders count.

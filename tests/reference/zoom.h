@@ -1,4 +1,5 @@
-// Per-pixel definition of the zoom: frames to half-resolution BGR by stripes, float planes to twice their size.
+// Per-pixel definition of the zoom: frames to half-resolution BGR by stripes, float planes to twice
+// their size.
 #pragma once
 
 #include <cstdint>
@@ -7,8 +8,8 @@
 
 namespace haze::reference {
 
-// Luma rows that stripe 0 ... 7 converts. Stripe 3 takes the remainder, so it reaches into the stripes after it and
-// the frame's last rows may belong to no stripe.
+// Luma rows that stripe 0 ... 7 converts. Stripe 3 takes the remainder, so it reaches into the
+// stripes after it and the frame's last rows may belong to no stripe.
 ImageRows zoom_out_stripe(int height, int stripe);
 
 // Converts the output pixels of the given luma rows of a frame with even sides.

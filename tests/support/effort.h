@@ -3,8 +3,8 @@
 
 namespace haze::test {
 
-// The second number under an emulator: qemu-user is slow, and keeps about a megabyte for every thread
-// that a program has ever started.
+// The second number under an emulator: qemu-user is slow, and keeps about a megabyte for every
+// thread that a program has ever started.
 constexpr int effort(int natively, int emulated) {
 #ifdef HAZE_TEST_EMULATED
   return (void)natively, emulated;

@@ -14,9 +14,8 @@ struct PublishedPair {
   double difference;
 };
 
-// Table 1 of "The CIEDE2000 Color-Difference Formula: Implementation Notes, Supplementary Test Data,
-// and Mathematical Observations" (Sharma, Wu, Dalal 2005).
-// clang-format off
+// Table 1 of "The CIEDE2000 Color-Difference Formula: Implementation Notes, Supplementary Test
+// Data, and Mathematical Observations" (Sharma, Wu, Dalal 2005). clang-format off
 const PublishedPair kPublished[] = {
     {{50.0000, 2.6772, -79.7751}, {50.0000, 0.0000, -82.7485}, 2.0425},
     {{50.0000, 3.1571, -77.2803}, {50.0000, 0.0000, -82.7485}, 2.8615},

@@ -1,5 +1,5 @@
-// WebP (RFC 9649): a RIFF file of chunks with little-endian lengths, padded to even ones. Files with
-// more than the picture begin with a VP8X chunk that tells what else there is.
+// WebP (RFC 9649): a RIFF file of chunks with little-endian lengths, padded to even ones. Files
+// with more than the picture begin with a VP8X chunk that tells what else there is.
 #include "media/byte_order.h"
 #include "media/picture_blocks.h"
 

@@ -1,4 +1,5 @@
-// Output: H.264 in MP4, MOV or MKV with copied sound and subtitles; Y4M or raw frames as a file or on a pipe.
+// Output: H.264 in MP4, MOV or MKV with copied sound and subtitles; Y4M or raw frames as a file or
+// on a pipe.
 #ifndef TOOLS_MEDIA_WRITER_VIDEO_H
 #define TOOLS_MEDIA_WRITER_VIDEO_H
 

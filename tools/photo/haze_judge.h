@@ -34,12 +34,12 @@ struct Removal {
 // not flicker, and start anew at a cut.
 class HazeJudge {
  public:
-  // Without a strength (0 ... 100) it is judged. frames_per_second: 0 if unknown. orientation: of the
-  // frames as they are stored.
+  // Without a strength (0 ... 100) it is judged. frames_per_second: 0 if unknown. orientation: of
+  // the frames as they are stored.
   HazeJudge(std::optional<int> strength, double frames_per_second, const Orientation& orientation);
 
-  // To be called first for each frame: looks at its light. True for the first frame after a cut, and
-  // the first of all.
+  // To be called first for each frame: looks at its light. True for the first frame after a cut,
+  // and the first of all.
   bool look_at(BgrImage& small);
 
   // Of the frames so far; whole numbers, which change only when the mean has left them.

@@ -11,9 +11,9 @@ namespace {
 constexpr int kLongestSmallSide = 512;
 constexpr int kShortestSmallSide = 8;
 
-// Of the dark channel that the light is looked for in, as a part of the longer side. A white boat or
-// parasol has to be smaller than the window to be passed over; with more than 3 % the window covers
-// the haze between roofs seen from above as well.
+// Of the dark channel that the light is looked for in, as a part of the longer side. A white boat
+// or parasol has to be smaller than the window to be passed over; with more than 3 % the window
+// covers the haze between roofs seen from above as well.
 constexpr int kLightWindowPart = 40;
 // Steps of the dark channel in its histogram. The library averages over one bin; with single values
 // a sky with a gradient would give the colour of its brightest corner.
@@ -25,8 +25,8 @@ constexpr double kBottomLoss = 0.4;
 constexpr int kGuidedWindowPart = 20;
 constexpr float kGuidedRegularization = 1e-3F;
 
-// Level 3 makes the float transmission 1 - 0.3 * share, which is above the library's floor of 0.4 for
-// every share up to 2: so the share comes back exactly, and the floor is ours to choose.
+// Level 3 makes the float transmission 1 - 0.3 * share, which is above the library's floor of 0.4
+// for every share up to 2: so the share comes back exactly, and the floor is ours to choose.
 constexpr int kProbeLevel = 3;
 constexpr float kProbeStrength = 0.3F;
 
@@ -56,14 +56,15 @@ double depth_in_view(int x, int y, const BgrImage& image, const Orientation& ori
   return orientation.flipped_y ? 1 - depth : depth;
 }
 
-// How much a pixel looks like thick haze, by its dark channel and its height: `depth` goes from 0 to
-// 1 down the picture.
+// How much a pixel looks like thick haze, by its dark channel and its height: `depth` goes from 0
+// to 1 down the picture.
 uint8_t haze_score(int dark, double depth) {
   const int score = static_cast<int>(dark * (1 - kBottomLoss * depth));
   return static_cast<uint8_t>(score / kDarkStep * kDarkStep);
 }
 
-// Means of 2 x 2 pixels, rounded; the last column and row are repeated where there is no second one.
+// Means of 2 x 2 pixels, rounded; the last column and row are repeated where there is no second
+// one.
 BgrImage halved(const BgrImage& image) {
   BgrImage half((image.width + 1) / 2, (image.height + 1) / 2);
   uint8_t* dst = half.bytes.data();
@@ -147,8 +148,8 @@ Plane enlarged(Plane plane, int width, int height) {
   return cropped;
 }
 
-// Least transmission that keeps every channel of the pixel within the range. Of the haze model itself:
-// I - A = (J - A) t.
+// Least transmission that keeps every channel of the pixel within the range. Of the haze model
+// itself: I - A = (J - A) t.
 float transmission_for_range(const uint8_t* bgr, const Light& light) {
   float least = 0;
   for (size_t c = 0; c < light.size(); ++c) {

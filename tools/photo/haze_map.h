@@ -2,10 +2,10 @@
 //
 // With the haze model I = J t + A (1 - t) the share of the haze is 1 - t. The dark-channel prior
 // (2009) takes it for the darkest that the neighbourhood of a pixel has in any channel, relative to
-// A: nearly everywhere something nearby would be black without haze. The guided filter (2010) brings
-// the edges of the picture back into that map of squares. Both work on a small copy of the picture,
-// so that "neighbourhood" means the same part of the view whatever the resolution; what the guided
-// filter learns there is applied at half resolution (as in "Fast guided filter", 2015).
+// A: nearly everywhere something nearby would be black without haze. The guided filter (2010)
+// brings the edges of the picture back into that map of squares. Both work on a small copy of the
+// picture, so that "neighbourhood" means the same part of the view whatever the resolution; what
+// the guided filter learns there is applied at half resolution (as in "Fast guided filter", 2015).
 #ifndef TOOLS_PHOTO_HAZE_MAP_H
 #define TOOLS_PHOTO_HAZE_MAP_H
 
@@ -23,12 +23,12 @@ using Light = std::array<uint8_t, 3>;
 // One pixel for each 2 x 2 block.
 BgrImage half_resolution(Nv21Frame& frame);
 
-// The picture halved until its longer side is at most 512 pixels. Pictures of less than 16 pixels in
-// one direction are not halved any further.
+// The picture halved until its longer side is at most 512 pixels. Pictures of less than 16 pixels
+// in one direction are not halved any further.
 BgrImage reduced(const BgrImage& image);
 
-// Colour of the thickest haze: the mean over the brightest part of the dark channel, the upper part of
-// the picture coming first.
+// Colour of the thickest haze: the mean over the brightest part of the dark channel, the upper part
+// of the picture coming first.
 Light estimate_light(BgrImage& small, const Orientation& orientation);
 
 // What the guided filter learns: around each pixel of the small picture the share of the haze is
