@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <filesystem>
 #include <limits>
+#include <memory>
 #include <numeric>
-#include <optional>
 
 #include "errors.h"
 #include "frame_path.h"
@@ -70,7 +70,8 @@ class Collector {
         view_maker_(reader, first, path_.size(), path_.siting()),
         gallery_(expected_frames),
         timeline_(reader) {
-    if (!options.reference.empty()) reference_.emplace(options.reference, reader.is_picture());
+    if (!options.reference.empty())
+      reference_ = std::make_unique<Reference>(options.reference, reader.is_picture());
   }
 
   void add(const AVFrame& frame) {
@@ -79,8 +80,7 @@ class Collector {
     const Nv21Frame& after = path_.run(frame);
     const double seconds = timeline_.seconds(frame, frames_);
     if (gallery_.wants(frames_)) {
-      View view =
-          view_maker_.make(before_, after, path_.engine(), reference_ ? &*reference_ : nullptr);
+      View view = view_maker_.make(before_, after, path_.engine(), reference_.get());
       view.frame = frames_;
       view.seconds = seconds;
       gallery_.add(std::move(view));
@@ -105,7 +105,7 @@ class Collector {
   ViewMaker view_maker_;
   Gallery gallery_;
   Timeline timeline_;
-  std::optional<Reference> reference_;
+  std::unique_ptr<Reference> reference_;
   int64_t frames_ = 0;
   std::vector<Moment> moments_;
 };
