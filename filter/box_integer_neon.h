@@ -75,8 +75,11 @@ inline int32x4_t running_sums_neon(int32x4_t before, int32x4_t changes) {
 // (v * m + 2^14) >> 20, where m = (2^20 - e) / rows and 1 <= e <= rows: v / rows, less at most
 // 255 * 64 / 2^20 < 1 / 64 (and not equal unless v = 0), plus 1 / 64. That never falls below
 // v / rows, and stays below the next integer, which is 1 / rows >= 1 / 64 away at least.
+//
+// Divided in double precision, which truncates to the same: 32-bit ARM calls its run-time library
+// for integers.
 inline int16x8_t reciprocal_of_rows(int rows) {
-  return vdupq_n_s16(static_cast<int16_t>(((1 << 20) - 1) / rows));
+  return vdupq_n_s16(static_cast<int16_t>(1048575.0 / rows));
 }
 inline uint8x8_t means_64_neon(int32x4_t low, int32x4_t high, int16x8_t reciprocal) {
   const int16x8_t v = vcombine_s16(vshrn_n_s32(low, 6), vshrn_n_s32(high, 6));
@@ -138,7 +141,7 @@ struct CountNeon {
     int s = 0;
     while (2 << s < count) ++s;
     // Exact in double precision but for the last bits of a quotient below 2^31.
-    const double quotient = static_cast<double>(int64_t{1} << (31 + s)) / count;
+    const double quotient = 0x1p31 * (1 << s) / count;
     reciprocal = vdupq_n_s32(static_cast<int32_t>(quotient) + 1);
     scale = vdupq_n_s32(16 - s);
   }
