@@ -25,6 +25,7 @@ int half_rounded_up(int side) { return side < 1 ? 0 : (side - 1) / 2 + 1; }
 
 void xYCrCb2BGRPreview(unsigned char* luma, unsigned char* uPlane, unsigned char* bgr, int width,
                        int height) {
+  if (width < 1) return;
   const int blocks = half_rounded_up(width);
   const ptrdiff_t frame_pixels = static_cast<ptrdiff_t>(haze::load_shared(gZoomOutHPreview)) *
                                  haze::load_shared(gZoomOutWPreview);
@@ -39,12 +40,14 @@ void xYCrCb2BGRPreview(unsigned char* luma, unsigned char* uPlane, unsigned char
 
 void xYCrCb2BGRPreview_NV21(unsigned char* luma, unsigned char* vu, unsigned char* bgr, int width,
                             int height) {
+  if (width < 1) return;
   convert_nv21(luma, vu, bgr, half_rounded_up(width), width / 2, half_rounded_up(height),
                2 * static_cast<ptrdiff_t>(width));
 }
 
 void xYCrCb2BGRPreviewNeon_NV21(unsigned char* luma, unsigned char* vu, unsigned char* bgr,
                                 int width, int height) {
+  if (width < 1) return;
   // Rounds odd sizes down, and steps from the pixels that it used: with an odd width both planes
   // drift by a byte per row.
   const int blocks = width / 2;

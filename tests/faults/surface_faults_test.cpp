@@ -21,11 +21,7 @@ int calls_per_block() {
   return text != nullptr ? std::atoi(text) : effort(12, 2);
 }
 
-std::vector<uint8_t> draw_choices(Random& random) {
-  std::vector<uint8_t> bytes(120);
-  for (uint8_t& byte : bytes) byte = random.byte();
-  return bytes;
-}
+constexpr size_t kChoices = 120;
 
 enum class Promise { kResult, kResultOrNothing };
 
@@ -80,7 +76,7 @@ TEST(SurfaceFaults, EveryAllocationInTurn) {
   Random random(test_seed());
   for (const Block& block : all_blocks())
     for (int i = 0; i < calls_per_block() && !HasFailure(); ++i) {
-      const std::vector<uint8_t> bytes = draw_choices(random);
+      const std::vector<uint8_t> bytes = draw_choices(random, kChoices);
       faults.run(block, bytes, [&](Failing failing) {
         return run_with_faults(block, bytes, failing, {}, Promise::kResultOrNothing);
       });
@@ -94,7 +90,7 @@ TEST(SurfaceFaults, EveryThreadInTurn) {
   Random random(test_seed());
   for (const Block& block : all_blocks())
     for (int i = 0; i < calls_per_block() && !HasFailure(); ++i) {
-      const std::vector<uint8_t> bytes = draw_choices(random);
+      const std::vector<uint8_t> bytes = draw_choices(random, kChoices);
       faults.run(block, bytes, [&](Failing failing) {
         return run_with_faults(block, bytes, {}, failing, Promise::kResult);
       });

@@ -7,11 +7,10 @@
 namespace haze::test {
 namespace {
 
-bool both_are_not_a_number(const uint8_t* a, const uint8_t* b) {
-  float first, second;
-  std::memcpy(&first, a, sizeof first);
-  std::memcpy(&second, b, sizeof second);
-  return std::isnan(first) && std::isnan(second);
+bool is_not_a_number(const uint8_t* bytes) {
+  float value;
+  std::memcpy(&value, bytes, sizeof value);
+  return std::isnan(value);
 }
 
 }  // namespace
@@ -41,9 +40,9 @@ size_t Call::first_difference(const Memory& memory) {
   const size_t step = memory.floats ? sizeof(float) : 1;
   for (size_t i = 0; i < memory.wanted.size(); i += step) {
     if (std::memcmp(memory.bytes + i, memory.wanted.data() + i, step) == 0) continue;
-    if (memory.floats && both_are_not_a_number(memory.bytes + i, memory.wanted.data() + i))
-      continue;
-    return i;
+    const bool both_are_none = memory.floats && is_not_a_number(memory.bytes + i) &&
+                               is_not_a_number(memory.wanted.data() + i);
+    if (!both_are_none) return i;
   }
   return memory.wanted.size();
 }
@@ -62,6 +61,21 @@ std::string Call::difference() const {
              std::to_string(memory.wanted[at]);
   }
   return {};
+}
+
+void Call::add_to(Fnv1a& digest) const {
+  constexpr uint8_t kNotANumber[sizeof(float)] = {};
+  for (const Memory& memory : memories_) {
+    const size_t step = memory.floats ? sizeof(float) : 1;
+    for (size_t i = 0; i < memory.wanted.size(); i += step) {
+      const uint8_t* const at = memory.bytes + i;
+      digest.add(memory.floats && is_not_a_number(at) ? kNotANumber : at, step);
+    }
+  }
+  for (int shift = 0; shift < 32; shift += 8) {
+    const uint8_t byte = static_cast<uint8_t>(static_cast<uint32_t>(result_) >> shift);
+    digest.add(&byte, 1);
+  }
 }
 
 bool Call::untouched() const {

@@ -9,6 +9,7 @@
 #include <string>
 #include <vector>
 
+#include "tests/support/fnv1a.h"
 #include "tests/support/guarded_bytes.h"
 
 namespace haze::test {
@@ -63,6 +64,9 @@ class Call {
 
   // Empty if everything is as promised; otherwise what is not.
   std::string difference() const;
+
+  // What the buffers hold, and the result. All that is not a number counts as the same.
+  void add_to(Fnv1a& digest) const;
 
   // Whether nothing at all was written, as promised for calls that memory is short for.
   bool untouched() const;

@@ -30,4 +30,10 @@ std::vector<uint8_t> Choices::rest(size_t count) {
   return bytes;
 }
 
+std::vector<uint8_t> draw_choices(Random& random, size_t count) {
+  std::vector<uint8_t> bytes(count);
+  for (uint8_t& byte : bytes) byte = random.byte();
+  return bytes;
+}
+
 }  // namespace haze::test

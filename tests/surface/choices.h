@@ -46,4 +46,7 @@ class Choices {
   int lane_;
 };
 
+// Bytes to decide by.
+std::vector<uint8_t> draw_choices(Random& random, size_t count);
+
 }  // namespace haze::test

@@ -12,12 +12,6 @@ namespace {
 
 constexpr int kCallsPerBlock = effort(60, 4);
 
-std::vector<uint8_t> draw_choices(Random& random) {
-  std::vector<uint8_t> bytes(static_cast<size_t>(random.between(4, 300)));
-  for (uint8_t& byte : bytes) byte = random.byte();
-  return bytes;
-}
-
 class Surface : public ::testing::TestWithParam<Placement> {};
 
 INSTANTIATE_TEST_SUITE_P(GuardPages, Surface,
@@ -30,7 +24,8 @@ TEST_P(Surface, EveryBlockKeepsItsPromises) {
   Random random(test_seed());
   for (const Block& block : all_blocks())
     for (int i = 0; i < kCallsPerBlock; ++i) {
-      const std::vector<uint8_t> bytes = draw_choices(random);
+      const std::vector<uint8_t> bytes =
+          draw_choices(random, static_cast<size_t>(random.between(4, 300)));
       Choices choices(bytes.data(), bytes.size());
       Call call(GetParam());
       block.draw(choices, call);

@@ -18,12 +18,7 @@ namespace {
 
 constexpr int kCallers = 8;
 constexpr int kRounds = effort(6, 1);
-
-std::vector<uint8_t> draw_choices(Random& random) {
-  std::vector<uint8_t> bytes(100);
-  for (uint8_t& byte : bytes) byte = random.byte();
-  return bytes;
-}
+constexpr size_t kChoices = 100;
 
 using Calls = std::vector<std::unique_ptr<Call>>;
 
@@ -60,7 +55,7 @@ TEST(Callers, EightOfEachBlockWithEqualSizes) {
   for (const Block& block : all_blocks()) {
     if (block.beside == Beside::kNone) continue;
     for (int round = 0; round < kRounds && !HasFailure(); ++round) {
-      Calls calls = draw_for_all(block, draw_choices(random));
+      Calls calls = draw_for_all(block, draw_choices(random, kChoices));
       run_at_once(calls, block.name);
     }
   }
@@ -74,7 +69,7 @@ TEST(Callers, EightOfAnyReentrantBlocks) {
   for (int round = 0; round < effort(40, 4) && !HasFailure(); ++round) {
     Calls calls;
     for (int lane = 0; lane < kCallers; ++lane) {
-      const std::vector<uint8_t> bytes = draw_choices(random);
+      const std::vector<uint8_t> bytes = draw_choices(random, kChoices);
       Choices choices(bytes.data(), bytes.size(), lane);
       calls.push_back(std::make_unique<Call>(Placement::kPageEnd));
       const size_t which =
@@ -92,7 +87,7 @@ TEST(Callers, ASessionBesideReentrantBlocks) {
   for (const Block& block : all_blocks())
     if (block.beside == Beside::kAny) blocks.push_back(block);
   std::vector<std::vector<uint8_t>> choices;
-  for (int i = 0; i < 7 * 10; ++i) choices.push_back(draw_choices(random));
+  for (int i = 0; i < 7 * 10; ++i) choices.push_back(draw_choices(random, kChoices));
   std::vector<std::thread> threads;
   for (size_t lane = 0; lane < 7; ++lane)
     threads.emplace_back([&, lane] {
