@@ -34,11 +34,16 @@ Plane luma_of(const RgbPicture& picture, size_t first_row, size_t rows) {
   return luma;
 }
 
+double pixels_of(const RgbPicture& picture) {
+  return static_cast<double>(picture.width) * picture.height;
+}
+
 std::array<double, kWindow> gaussian_window() {
+  constexpr int kMiddle = kWindow / 2;
   std::array<double, kWindow> weights;
   double sum = 0;
   for (int i = 0; i < kWindow; ++i) {
-    const double distance = i - kWindow / 2;
+    const double distance = i - kMiddle;
     weights[static_cast<size_t>(i)] = std::exp(-distance * distance / (2 * kSigma * kSigma));
     sum += weights[static_cast<size_t>(i)];
   }
@@ -125,7 +130,7 @@ double mean_ciede2000(const RgbPicture& a, const RgbPicture& b) {
   for (size_t i = 0; i < a.bytes.size(); i += 3) {
     sum += ciede2000(lab_of_srgb(&a.bytes[i]), lab_of_srgb(&b.bytes[i]));
   }
-  return sum / static_cast<double>(a.bytes.size() / 3);
+  return sum / pixels_of(a);
 }
 
 double mean_hue_shift(const RgbPicture& reference, const RgbPicture& picture) {
@@ -147,7 +152,7 @@ double clipped_share(const RgbPicture& picture) {
     const auto begin = picture.bytes.begin() + static_cast<std::ptrdiff_t>(i);
     if (std::any_of(begin, begin + 3, [](uint8_t v) { return v == 0 || v == 255; })) ++clipped;
   }
-  return static_cast<double>(clipped) / static_cast<double>(picture.bytes.size() / 3);
+  return static_cast<double>(clipped) / pixels_of(picture);
 }
 
 }  // namespace dehaze

@@ -50,11 +50,11 @@ PreviewEngine::PreviewEngine(int width, int height, const EngineOptions& options
 
 PreviewEngine::~PreviewEngine() { ReleaseHazePreview(); }
 
-void PreviewEngine::judge(Nv21Frame& frame) {
+void PreviewEngine::set_level(HazeJudge& judge, Nv21Frame& frame) {
   BgrImage small = reduced(half_resolution(frame));
-  judge_->look_at(small);
-  const GuidedModel model = fit_guided_model(small, judge_->light());
-  const Removal removal = judge_->judge(share_of_haze(small, model, judge_->light()));
+  judge.look_at(small);
+  const GuidedModel model = fit_guided_model(small, judge.light());
+  const Removal removal = judge.judge(share_of_haze(small, model, judge.light()));
   level_ = static_cast<int>(std::lround(kHazyLevel * removal.amount));
   if (--frames_to_judge_ == 0) judge_.reset();
 }
@@ -63,7 +63,7 @@ void PreviewEngine::process(Nv21Frame& frame) {
   if (frame.width != width_ || frame.height != height_) {
     throw Error("internal error: a frame does not have the size of its session");
   }
-  if (judge_) judge(frame);
+  if (judge_) set_level(*judge_, frame);
   using Clock = std::chrono::steady_clock;
   const bool is_estimate = gPreFrameNum == 0;
   const Clock::time_point start = Clock::now();

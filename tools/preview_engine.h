@@ -21,7 +21,7 @@ class PreviewEngine : public Engine {
   std::vector<float> transmission() const override;
 
  private:
-  void judge(Nv21Frame& frame);
+  void set_level(HazeJudge& judge, Nv21Frame& frame);
 
   int width_;
   int height_;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cinttypes>
+#include <cmath>
 #include <cstdio>
 #include <utility>
 
@@ -48,8 +49,7 @@ std::string progress_text(const std::string& unit, int64_t done, int64_t total, 
                   unit.c_str());
     return text;
   }
-  const int64_t left =
-      speed > 0 ? static_cast<int64_t>(static_cast<double>(total - done) / speed + 0.5) : 0;
+  const int64_t left = speed > 0 ? std::llround(static_cast<double>(total - done) / speed) : 0;
   std::snprintf(text, sizeof(text),
                 "%" PRId64 "/%" PRId64 " %s, %" PRId64 " %%, %.1f %s/s, %s left", done, total,
                 unit.c_str(), done * 100 / total, speed, unit.c_str(), duration_text(left).c_str());

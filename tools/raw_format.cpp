@@ -34,7 +34,7 @@ std::optional<int> positive_number(const std::string& text) {
 std::string cut_behind(std::string& text, char mark) {
   const size_t position = text.find(mark);
   if (position == std::string::npos) return "";
-  const std::string behind = text.substr(position + 1);
+  std::string behind = text.substr(position + 1);
   text.erase(position);
   return behind;
 }

@@ -41,7 +41,8 @@ void draw_map(const std::vector<float>& transmission, Nv21Frame& frame) {
 void draw_compare(const Nv21Frame& before, Nv21Frame& frame) {
   const size_t width = static_cast<size_t>(frame.width);
   const int divider = std::min(divider_width(frame.width), frame.width / 2);
-  const size_t begin = static_cast<size_t>((frame.width - divider) / 4 * 2);
+  const int chroma_samples = (frame.width - divider) / 4;
+  const size_t begin = static_cast<size_t>(chroma_samples) * 2;
   const size_t luma_rows = static_cast<size_t>(frame.height);
   for (size_t y = 0; y < luma_rows + luma_rows / 2; ++y) {
     split_row(&before.bytes[y * width], &frame.bytes[y * width], begin,

@@ -40,7 +40,7 @@ void StageThreads::run(const std::function<void()>& stage) {
 void StageThreads::fail(std::exception_ptr failure) {
   {
     const std::lock_guard<std::mutex> lock(mutex_);
-    if (!failure_) failure_ = failure;
+    if (!failure_) failure_ = std::move(failure);
   }
   request_stop();
   cancel_();

@@ -96,7 +96,7 @@ class TiffEditor {
 
 Bytes find_exif(const Bytes& file) {
   for (const auto find : {jpeg_exif, png_exif, webp_exif}) {
-    const Bytes exif = find(file);
+    Bytes exif = find(file);
     if (!exif.empty()) return exif;
   }
   return {};

@@ -1,11 +1,11 @@
 #include "media/writer_picture.h"
 
 #include <cerrno>
-#include <cstdio>
 #include <cstring>
 
 #include "errors.h"
 #include "media/av_error.h"
+#include "write_file.h"
 
 namespace dehaze {
 namespace {
@@ -54,10 +54,6 @@ EncoderPtr open_encoder(const AVFrame& frame, OutputKind kind) {
   return encoder;
 }
 
-struct CloseFile {
-  void operator()(std::FILE* file) const { std::fclose(file); }
-};
-
 Bytes profile_of(const AVFrame& frame) {
   const AVFrameSideData* profile = av_frame_get_side_data(&frame, AV_FRAME_DATA_ICC_PROFILE);
   return profile == nullptr ? Bytes() : Bytes(profile->data, profile->data + profile->size);
@@ -73,13 +69,6 @@ Bytes with_blocks(const Bytes& file, const AVFrame& frame, OutputKind kind, cons
     default:
       return exif.empty() ? file : jpeg_with_exif(file, exif);
   }
-}
-
-void write_file(const Bytes& bytes, const std::string& path) {
-  std::unique_ptr<std::FILE, CloseFile> file(std::fopen(path.c_str(), "wb"));
-  bool written = file && std::fwrite(bytes.data(), 1, bytes.size(), file.get()) == bytes.size();
-  if (file) written = std::fclose(file.release()) == 0 && written;
-  if (!written) throw Error(std::string("cannot write the picture: ") + std::strerror(errno));
 }
 
 }  // namespace
@@ -109,7 +98,10 @@ void write_picture(const AVFrame& frame, OutputKind kind, const std::string& pat
   check(avcodec_receive_packet(encoder.get(), packet.get()), what);
   const Bytes encoded(packet->data, packet->data + packet->size);
   packet.reset();
-  write_file(with_blocks(encoded, frame, kind, exif), path);
+  const Bytes file = with_blocks(encoded, frame, kind, exif);
+  if (!write_file(path, file.data(), file.size())) {
+    throw Error(std::string("cannot write the picture: ") + std::strerror(errno));
+  }
 }
 
 }  // namespace dehaze

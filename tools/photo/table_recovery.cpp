@@ -42,6 +42,7 @@ std::vector<uint8_t> recovery_codes(const Plane& share, const Removal& removal) 
   }
   std::vector<uint8_t> codes(share.values.size());
   std::transform(share.values.begin(), share.values.end(), codes.begin(), [&](float value) {
+    // NOLINTNEXTLINE(bugprone-incorrect-roundings): lround is a call for each pixel
     return code_of_step[static_cast<size_t>(std::clamp(value, 0.0F, 1.0F) * kShareSteps + 0.5F)];
   });
   return codes;

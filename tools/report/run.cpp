@@ -1,7 +1,6 @@
 #include "report/run.h"
 
 #include <cerrno>
-#include <cstdio>
 #include <cstring>
 #include <filesystem>
 
@@ -11,6 +10,7 @@
 #include "report/collect.h"
 #include "report/options.h"
 #include "report/page.h"
+#include "write_file.h"
 
 namespace dehaze {
 namespace {
@@ -18,13 +18,9 @@ namespace {
 void write_page(const std::string& text, const ReportOptions& options) {
   throw_if_interrupted();
   OutputFile file(options.output, options.force);
-  std::FILE* const stream = std::fopen(file.temporary_path().c_str(), "wb");
-  bool written = stream != nullptr;
-  if (stream != nullptr) {
-    written = std::fwrite(text.data(), 1, text.size(), stream) == text.size();
-    written = std::fclose(stream) == 0 && written;
+  if (!write_file(file.temporary_path(), text.data(), text.size())) {
+    throw Error(options.output + ": cannot write the page: " + std::strerror(errno));
   }
-  if (!written) throw Error(options.output + ": cannot write the page: " + std::strerror(errno));
   throw_if_interrupted();
   file.commit();
 }

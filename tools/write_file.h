@@ -1,0 +1,14 @@
+#ifndef TOOLS_WRITE_FILE_H
+#define TOOLS_WRITE_FILE_H
+
+#include <cstddef>
+#include <string>
+
+namespace dehaze {
+
+// Replaces the content of a file. False with errno set if not all of it could be written.
+bool write_file(const std::string& path, const void* bytes, size_t size);
+
+}  // namespace dehaze
+
+#endif  // TOOLS_WRITE_FILE_H
