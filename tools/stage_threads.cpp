@@ -1,7 +1,9 @@
 #include "stage_threads.h"
 
 #include <chrono>
+#include <system_error>
 
+#include "errors.h"
 #include "interrupt.h"
 
 namespace dehaze {
@@ -18,11 +20,14 @@ StageThreads::~StageThreads() {
 }
 
 void StageThreads::start(std::function<void()> stage) {
-  {
-    const std::lock_guard<std::mutex> lock(mutex_);
-    ++running_;
+  // Until it counts, it cannot end.
+  const std::lock_guard<std::mutex> lock(mutex_);
+  try {
+    threads_.emplace_back([this, stage = std::move(stage)] { run(stage); });
+  } catch (const std::system_error& error) {
+    throw Error("cannot start a thread: " + error.code().message());
   }
-  threads_.emplace_back([this, stage = std::move(stage)] { run(stage); });
+  ++running_;
 }
 
 void StageThreads::run(const std::function<void()>& stage) {
