@@ -156,6 +156,15 @@ case_too_large() {
   equal "$(stream out.png v width,height)" 1280,720
 }
 
+case_too_large_at_all() {
+  make_input -f lavfi -i color=gray:size=32770x16 -frames:v 1 -pix_fmt gray in.pgm
+  dehaze_fails 1 'the picture is 32770 x 16; .* no side above 32768, so reduce it' \
+    --engine photo in.pgm out.png
+  make_input -f lavfi -i color=gray:size=16000x8400 -frames:v 1 -pix_fmt gray in.pgm
+  dehaze_fails 1 'the picture is 16000 x 8400; .* at most 134 megapixels' --engine photo in.pgm out.png
+  only_files in.pgm
+}
+
 # The scaled picture is that of the input scaled by somebody else.
 case_scaled_content() {
   make_picture in.png 1920x1080
@@ -212,6 +221,19 @@ case_transparency() {
   dehaze in.png out.jpg
   says 'JPEG has no transparency'
   same_picture out.jpg want.jpg
+}
+
+case_transparency_scaled_down() {
+  make_input -f lavfi -i testsrc2=size=1600x900 -frames:v 1 \
+    -vf "format=rgba,geq=r=r(X\,Y):g=g(X\,Y):b=b(X\,Y):a=min(255\,X/4)" in.png
+  make_input -i in.png -vf "alphaextract,format=gray,scale=1280:720:flags=bicubic" want_alpha.png
+  local kind
+  for kind in png webp; do
+    dehaze --engine preview in.png "out.$kind"
+    equal "$(stream "out.$kind" v width,height)" 1280,720
+    alpha_of "out.$kind" alpha.png
+    close_pictures alpha.png want_alpha.png 50
+  done
 }
 
 # JPEG is full range, whatever its chroma looks like.

@@ -76,12 +76,12 @@ FramePtr yuva420p_from(const AVFrame& yuv, const AVFrame& alpha) {
 FramePtr take_alpha(const AVFrame& frame, int width, int height) {
   const AVPixFmtDescriptor& format = *av_pix_fmt_desc_get(static_cast<AVPixelFormat>(frame.format));
   if (!(format.flags & AV_PIX_FMT_FLAG_ALPHA)) return nullptr;
-  std::string filter = "format=rgba";
+  std::string filter = "format=rgba,alphaextract";
   if (frame.width != width || frame.height != height) {
     filter += ",scale=" + std::to_string(width) + ":" + std::to_string(height) +
               ":flags=bicubic+accurate_rnd";
   }
-  FramePtr alpha = run_filter(frame, filter + ",alphaextract,format=gray");
+  FramePtr alpha = run_filter(frame, filter + ",format=gray");
   return is_opaque(*alpha) ? nullptr : std::move(alpha);
 }
 
