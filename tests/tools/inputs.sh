@@ -126,6 +126,63 @@ case_cmyk_jpeg() {
   done
 }
 
+# jpeg_440 FILE: 160 x 160 pixels, a chroma sample for two rows; every 8 x 8 block of one value.
+jpeg_440() {
+  python3 - "$1" <<'PYTHON'
+import struct, sys
+bits, last = "", [0] * 3
+for y in range(10):
+    for x in range(20):
+        for c, value in ((0, 60 + x * 6), (0, 90 + x * 4), (1, 100 + y * 4), (2, 150 - x * 2)):
+            step = (value - 128) - last[c]  # the table divides by 8: one step is one level
+            last[c] += step
+            width = abs(step).bit_length()
+            # Twelve symbols of four bits each for DC differences, one of a bit, "end of block", for AC.
+            bits += format(width, "04b")
+            if width: bits += format(step if step > 0 else step + (1 << width) - 1, "0%db" % width)
+            bits += "0"
+bits += "1" * (-len(bits) % 8)
+scan = bytes(int(bits[i:i + 8], 2) for i in range(0, len(bits), 8)).replace(b"\xff", b"\xff\0")
+def segment(marker, data): return b"\xff" + bytes([marker]) + struct.pack(">H", len(data) + 2) + data
+open(sys.argv[1], "wb").write(
+    b"\xff\xd8" + segment(0xDB, b"\0" + b"\x08" * 64) +
+    segment(0xC0, struct.pack(">BHHB", 8, 160, 160, 3) + bytes([1, 0x12, 0, 2, 0x11, 0, 3, 0x11, 0])) +
+    segment(0xC4, b"\0" + bytes([0, 0, 0, 12] + [0] * 12) + bytes(range(12))) +
+    segment(0xC4, b"\x10" + bytes([1] + [0] * 15) + b"\0") +
+    segment(0xDA, b"\3\1\0\2\0\3\0\0\x3f\0") + scan + b"\xff\xd9")
+PYTHON
+}
+
+case_jpeg_440() {
+  command -v python3 >/dev/null || skip "python3 is not installed"
+  jpeg_440 in.jpg
+  equal "$(stream in.jpg v pix_fmt)" yuvj440p
+  ends in.jpg out.png result
+  make_input -i in.jpg -vf format=rgb24 seen.png
+  different_pictures seen.png out.png 60
+  rm out.png
+  dehaze --engine photo --strength 0 in.jpg out.png
+  close_pictures out.png seen.png 30
+}
+
+# Where chroma samples lie, colours lie.
+case_chroma_sitings() {
+  local siting seen=0
+  for siting in left center topleft top bottomleft bottom; do
+    film in.mkv -c:v libx264 -pix_fmt yuv420p -x264opts chromaloc=$seen
+    seen=$((seen + 1))
+    equal "$(stream in.mkv v chroma_location)" $siting
+    ends in.mkv out.mkv result
+    equal "$(stream out.mkv v chroma_location)" $siting
+    ends in.mkv out.png result
+    make_input -i in.mkv -frames:v 1 \
+      -vf "zscale=min=170m:rin=limited:cin=$siting:m=gbr:r=full:f=lanczos,format=gbrp,format=rgb24" seen.png
+    rm -f out.png
+    dehaze --engine photo --strength 0 in.mkv out.png
+    close_pictures out.png seen.png 30
+  done
+}
+
 case_not_media() {
   : >empty.png
   ends empty.png out.png 'the file is empty'
@@ -141,6 +198,9 @@ case_not_media() {
   ends photo.nef out.png 'camera raw files are not read'
   printf '\0\0\0\x18ftypheic\0\0\0\0heicmif1' >phone.heic
   ends phone.heic out.jpg 'HEIC and AVIF pictures are not read'
+  film unknown.avi -c:v mpeg4
+  LC_ALL=C sed -i 's/FMP4/ABCD/g' unknown.avi
+  ends unknown.avi out.mp4 'there is no decoder for "ABCD"'
   ends missing.mp4 out.mp4 'No such file or directory'
 }
 

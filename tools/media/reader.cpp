@@ -43,6 +43,13 @@ bool is_companion(const AVStream& stream) {
   return type == AVMEDIA_TYPE_AUDIO || type == AVMEDIA_TYPE_SUBTITLE;
 }
 
+std::string coding_name(const AVCodecParameters& parameters) {
+  char tag[AV_FOURCC_MAX_STRING_SIZE];
+  return parameters.codec_id == AV_CODEC_ID_NONE
+             ? std::string("\"") + av_fourcc_make_string(tag, parameters.codec_tag) + "\""
+             : avcodec_get_name(parameters.codec_id);
+}
+
 void check_readable_file(const std::string& path) {
   struct stat status = {};
   if (stat(path.c_str(), &status) != 0) throw Error(path + ": " + std::strerror(errno));
@@ -130,8 +137,7 @@ void Reader::choose_streams() {
 void Reader::open_decoder() {
   const AVCodec* codec = avcodec_find_decoder(video_->codecpar->codec_id);
   if (codec == nullptr) {
-    throw Error(path_ + ": there is no decoder for " +
-                avcodec_get_name(video_->codecpar->codec_id));
+    throw Error(path_ + ": there is no decoder for " + coding_name(*video_->codecpar));
   }
   decoder_.reset(avcodec_alloc_context3(codec));
   if (!decoder_) throw std::bad_alloc();
