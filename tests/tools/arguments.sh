@@ -137,4 +137,33 @@ case_compare_tool() {
   done
 }
 
+case_compare_usage() {
+  "$HAZE_COMPARE" --help | holds '^haze_compare A B ' || fail "$("$HAZE_COMPARE" --help)"
+  local status=0
+  "$HAZE_COMPARE" one.png 2>messages || status=$?
+  equal $status 2 status
+  says '^haze_compare A B '
+  make_picture small.png 10x200
+  ! "$HAZE_COMPARE" small.png small.png 2>messages || fail "compared less than a window"
+  says '^haze_compare: the pictures are too small'
+}
+
+# Nobody knows how long a pipe is; a line that wrapped could not be overwritten.
+case_progress_of_a_pipe_on_a_narrow_terminal() {
+  command -v script >/dev/null || skip "script(1) is not installed"
+  make_input -f lavfi -i "$(source_video 160x160 1)" -pix_fmt yuv420p in.y4m
+  script -qec "stty cols 15; cat in.y4m | $DEHAZE - out.mkv" typescript >/dev/null </dev/null
+  grep -aq '1 frames, ' typescript || fail "$(cat -v typescript)"
+  ! grep -aq 'frames/s' typescript || fail "more than 15 columns: $(cat -v typescript)"
+}
+
+case_progress_in_hours() {
+  command -v script >/dev/null || skip "script(1) is not installed"
+  truncate -s 4T in.raw || skip "the file system has no files of that size"
+  script -qec "timeout -s INT 3 $DEHAZE --raw 160x160 in.raw out.mkv" typescript >/dev/null </dev/null || true
+  grep -Eaq '[0-9]+/[0-9]+ frames, 0 %, [0-9.]+ frames/s, [0-9]+:[0-5][0-9]:[0-5][0-9] left' typescript ||
+    fail "no progress line in: $(cat -v typescript)"
+  only_files in.raw typescript
+}
+
 run_case "$1"

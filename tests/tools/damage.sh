@@ -11,6 +11,8 @@ case_not_a_picture() {
   seq 1000 >text.jpg
   head -c 5000 /dev/urandom >noise.mp4
   dehaze_fails 1 'missing.jpg: No such file' missing.jpg out.png
+  dehaze_fails 1 'missing.jpg: No such file' missing.jpg out.unknown
+  dehaze_fails 1 '\.: is a folder; give the name of a picture or a video' --show light .
   dehaze_fails 2 'out.png: looks like the name of a file; . is a folder' . out.png
   dehaze_fails 1 'the file is empty' empty.jpg out.png
   dehaze_fails 1 'text.jpg: not a picture or video' text.jpg out.png
@@ -109,6 +111,30 @@ case_random_damage() {
       rm -f "$output"
     done
   done
+}
+
+case_mp4_that_ends_between_frames() {
+  make_input -f lavfi -i "$(source_video 160x160 4)" -c:v libx264 -movflags +faststart in.mp4
+  # Everything before the 50th of 100 frames: nothing is cut in two.
+  head -c "$(ffprobe -v error -select_streams v -show_entries packet=pos -of csv=p=0 in.mp4 |
+    tr -d , | sort -n | sed -n 50p)" in.mp4 >cut.mp4
+  dehaze_fails 1 'damaged or incomplete: it ends after [12]\.[0-9] of 4\.0 seconds' cut.mp4 out.mp4
+  only_files in.mp4 cut.mp4
+}
+
+# The sound of the frames that are wanted lies behind the damage.
+case_damage_behind_the_frames() {
+  make_video in.avi 160x160 1
+  local position
+  position=$(ffprobe -v error -select_streams v -show_entries packet=pos -of csv=p=0 in.avi |
+    tr -d , | sed -n 11p)
+  head -c $((position + 20)) in.avi >cut.avi
+  dehaze_fails 1 'damaged or incomplete' cut.avi out.mkv
+  local frames
+  frames=$(sed -nE 's/.*--max-frames ([0-9]+).*/\1/p' messages)
+  dehaze --max-frames "$frames" cut.avi out.mkv
+  equal "$(frame_times out.mkv | wc -l)" "$frames" frames
+  [ -n "$(stream out.mkv a codec_name)" ] || fail "no sound"
 }
 
 run_case "$1"

@@ -159,4 +159,26 @@ case_two_runs_side_by_side() {
   only_files in.mp4 out.mp4 first second
 }
 
+case_awkward_folders_and_names() {
+  make_picture in.png 160x160
+  # Nobody makes files there.
+  dehaze_fails 1 '/proc/out.png: cannot create a file in that folder' in.png /proc/out.png
+  # The name of the unfinished file is shortened, that of the result is not.
+  dehaze_fails 1 'cannot rename the finished file: File name too long' in.png \
+    "$(printf 'x%.0s' $(seq 300)).png"
+  only_files in.png
+}
+
+case_files_of_limited_size() {
+  make_picture in.png 640x480
+  trap '' XFSZ
+  ulimit -f 8 # blocks of a kilobyte
+  local kind
+  for kind in png jpg webp; do
+    dehaze_fails 1 'cannot write the picture: File too large' in.png out.$kind
+  done
+  dehaze_fails 1 'out.html: cannot write the page: File too large' report in.png -o out.html
+  only_files in.png
+}
+
 run_case "$1"

@@ -211,4 +211,13 @@ case_progress_of_all() {
   equal "$(wc -l <messages)" 1 "lines without a terminal"
 }
 
+case_file_in_place_of_a_folder() {
+  make_folder photos
+  mkdir out
+  : >"out/day 1"
+  dehaze_fails 1 'out/day 1: cannot make this folder: Not a directory' photos -o out
+  says '^dehaze: 1 done, 0 skipped because the output exists, 3 failed'
+  equal "$(files_in out)" "a.png day 1 "
+}
+
 run_case "$1"

@@ -4,6 +4,19 @@ source "$(dirname "$0")/lib.sh"
 
 tag_of() { ffprobe -v error -show_entries "frame_tags=$2" -of csv=p=0 "$1"; }
 
+# exif_webp IN OUT ORIENTATION: the same for a WebP file of 322 x 200 pixels without any such blocks.
+exif_webp() {
+  python3 - "$@" <<'PYTHON'
+import struct, sys
+frame = open(sys.argv[1], "rb").read()[12:]
+def block(name, data): return name + struct.pack("<I", len(data)) + data
+exif = b"MM\0\x2a" + struct.pack(">IHHHIHHI", 8, 1, 0x0112, 3, 1, int(sys.argv[3]), 0, 0)
+size = (322 - 1).to_bytes(3, "little") + (200 - 1).to_bytes(3, "little")
+blocks = b"WEBP" + block(b"VP8X", b"\x08\0\0\0" + size) + frame + block(b"EXIF", exif)
+open(sys.argv[2], "wb").write(b"RIFF" + struct.pack("<I", len(blocks)) + blocks)
+PYTHON
+}
+
 # At a level nothing is judged. Left to itself, the tool looks for the light where up is.
 case_exif_orientation() {
   make_picture plain.jpg 321x200 yuvj420p
@@ -18,6 +31,21 @@ case_exif_orientation() {
     dehaze --force --level 10 in.jpg out.jpg
     close_pictures out.jpg want.png 28
     equal "$(tag_of out.jpg Orientation | tr -d ' ')" 1 "orientation of the upright output"
+  done
+}
+
+# WebP has nothing but the EXIF block to say it.
+case_exif_orientation_of_webp() {
+  command -v python3 >/dev/null || skip "python3 is not installed"
+  make_picture plain.webp 322x200 yuv420p
+  dehaze --level 10 plain.webp upright.png
+  local turn
+  for turn in 1:null 2:hflip 3:hflip,vflip 4:vflip 5:transpose=0 6:transpose=clock \
+    7:transpose=3 8:transpose=cclock; do
+    exif_webp plain.webp in.webp "${turn%%:*}"
+    make_input -i upright.png -vf "${turn#*:}" want.png
+    dehaze --force --level 10 in.webp out.png
+    same_picture out.png want.png
   done
 }
 

@@ -245,6 +245,9 @@ case_usage() {
   dehaze_fails 1 'No such file' report none.png -o out.html
   dehaze_fails 1 'is a folder' report . -o out.html
   dehaze_fails 1 'no such folder' report in.png -o none/out.html
+  mkdir folder.html
+  dehaze_fails 1 'folder.html: is a folder; give the name of a file' report in.png -o folder.html
+  rmdir folder.html
   only_files in.png
   report in.png out.html
   cp out.html before.html
@@ -273,6 +276,44 @@ case_files_of_that_name() {
   dehaze --force report out.png
   report report -o report.html
   grep -q '<h1>report</h1>' report.html || fail "another input"
+}
+
+labels_of() { grep -oE '<span>[^<]*</span></label>' "$1" | sed 's/<[^>]*>/ /g' | xargs; }
+
+case_times() {
+  make_input -f lavfi -i testsrc2=size=160x160:rate=1/30:duration=120 -c:v libx264 slow.mp4
+  report slow.mp4 -o slow.html
+  equal "$(labels_of slow.html)" "0.0 s 30.0 s 1:00 1:30"
+  # Frames without time stamps follow each other at the stream's rate.
+  make_video in.mp4 160x160 0.4
+  make_input -i in.mp4 -c:v libx264 -x264opts bframes=0 in.h264
+  report in.h264 -o raw.html
+  equal "$(labels_of raw.html)" "0.0 s 0.1 s 0.2 s 0.2 s 0.3 s"
+}
+
+# Printers' profiles are longer than the picture.
+case_large_profile() {
+  command -v python3 >/dev/null || skip "python3 is not installed"
+  make_picture plain.jpg 160x160 yuvj420p
+  python3 -c '
+data = open("plain.jpg", "rb").read()
+segment = b"ICC_PROFILE\0\1\1" + b"p" * 20000
+open("in.jpg", "wb").write(data[:2] + b"\xff\xe2" + (len(segment) + 2).to_bytes(2, "big") + segment + data[2:])'
+  has_profile in.jpg
+  report in.jpg -o out.html
+  check_page out.html 1000000
+  picture_of out.html 1
+  ! ffprobe -v error -show_frames picture_1.jpg | holds 'ICC profile' || fail "20000 bytes in each picture"
+}
+
+# Pictures that are too long in every quality get smaller.
+case_noise() {
+  head -c $((1600 * 1600 * 3)) /dev/urandom >noise
+  make_input -f rawvideo -pix_fmt rgb24 -s 1600x1600 -i noise in.png
+  report --strength 50 in.png -o out.html
+  check_page out.html 3000000
+  picture_of out.html 2
+  echo "$(stream picture_2.jpg v width)"
 }
 
 run_case "$1"

@@ -120,4 +120,14 @@ case_name_with_a_dash() {
   only_files -in.png -out.png -o.png
 }
 
+case_json_of_control_characters() {
+  need_python
+  local name=$'a\tb\nc\x1b.png'
+  make_picture in.png 160x160
+  mv in.png "$name"
+  "$DEHAZE" --json "$name" out.png >result
+  equal "$(wc -l <result)" 1 lines
+  equal "$(field result 0 'o["input"]')" "$name"
+}
+
 run_case "$1"
