@@ -124,16 +124,16 @@ case_mp4_that_ends_between_frames() {
 
 # The sound of the frames that are wanted lies behind the damage.
 case_damage_behind_the_frames() {
-  make_video in.avi 160x160 1
-  local position
-  position=$(ffprobe -v error -select_streams v -show_entries packet=pos -of csv=p=0 in.avi |
-    tr -d , | sed -n 11p)
-  head -c $((position + 20)) in.avi >cut.avi
-  dehaze_fails 1 'damaged or incomplete' cut.avi out.mkv
-  local frames
-  frames=$(sed -nE 's/.*--max-frames ([0-9]+).*/\1/p' messages)
-  dehaze --max-frames "$frames" cut.avi out.mkv
-  equal "$(frame_times out.mkv | wc -l)" "$frames" frames
+  # Each packet of this video is a frame at once.
+  make_input -f lavfi -i "$(source_video 160x160 1)" -f lavfi -i sine=duration=1 -pix_fmt yuv420p \
+    -c:v rawvideo -c:a pcm_s16le in.avi
+  local position size
+  IFS=, read -r size position _ <<<"$(ffprobe -v error -select_streams v \
+    -show_entries packet=size,pos -of csv=p=0 in.avi | sed -n 10p)"
+  head -c $((position + 8 + size + 20)) in.avi >cut.avi
+  dehaze_fails 1 'damaged or incomplete: .*--max-frames 10 takes the part' cut.avi out.mkv
+  dehaze --max-frames 10 cut.avi out.mkv
+  equal "$(frame_times out.mkv | wc -l)" 10 frames
   [ -n "$(stream out.mkv a codec_name)" ] || fail "no sound"
 }
 

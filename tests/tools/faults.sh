@@ -3,7 +3,7 @@
 source "$(dirname "$0")/lib.sh"
 
 # The sanitizers have to be loaded first, and replace the same functions.
-[ -z "$SANITIZERS" ] || skip "a build with sanitizers"
+[ -z "${SANITIZERS:-}" ] || skip "a build with sanitizers"
 
 with_fault() { # FAULT ARGUMENT...: the tool's status
   local status=0

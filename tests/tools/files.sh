@@ -110,6 +110,26 @@ case_signals() {
   run_and_signal HUP 129
 }
 
+# Whoever insists does not wait for the end of the frame.
+case_second_signal() {
+  make_input -f lavfi -i "$(source_video 640x480 20)" -pix_fmt yuv420p in.y4m
+  env --default-signal=INT "$DEHAZE" in.y4m out.mp4 2>messages &
+  local process=$! status=0
+  for _ in $(seq 100); do
+    [ -n "$(find . -name '.out.*.part.mp4' -size +0)" ] && break
+    sleep 0.05
+  done
+  # While it is stopped, so that both are there before it can look at the first.
+  kill -STOP $process
+  kill -INT $process
+  kill -TERM $process
+  kill -CONT $process
+  wait $process || status=$?
+  [ $status -eq 130 ] || [ $status -eq 143 ] || fail "status $status"
+  says_nothing
+  only_files in.y4m
+}
+
 # Killed without a chance to clean up: nothing under the output's name, and the next run works.
 case_killed() {
   make_input -f lavfi -i "$(source_video 640x480 20)" -pix_fmt yuv420p in.y4m
