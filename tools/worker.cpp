@@ -91,7 +91,7 @@ int work(const Options& options, const WorkerConsole& sender, Console& console) 
     // Without a last word; the parent says that it ended early.
   }
   // Not exit(): what the parent has buffered is the parent's.
-  _exit(status);
+  std::quick_exit(status);
 }
 
 bool take_word(const std::string& line, const char* word, std::string& rest) {
