@@ -54,7 +54,7 @@ void PreviewEngine::set_level(HazeJudge& judge, Nv21Frame& frame) {
   BgrImage small = reduced(half_resolution(frame));
   judge.look_at(small);
   const GuidedModel model = fit_guided_model(small, judge.light());
-  const Removal removal = judge.judge(share_of_haze(small, model, judge.light()));
+  const Removal removal = judge.judge(small, model);
   level_ = static_cast<int>(std::lround(kHazyLevel * removal.amount));
   if (--frames_to_judge_ == 0) judge_.reset();
 }

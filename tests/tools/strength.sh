@@ -63,6 +63,65 @@ case_auto_tells_haze_from_clear_air() {
   [ "$strength" -le 15 ] || fail "strength $strength for a clear picture"
 }
 
+case_bright_grey_things_are_not_haze() {
+  # Sky, sand with dark things on its far part, bare sand in front.
+  make_input -f lavfi -i "color=0xc8d8e8:size=640x480,format=rgb24" -frames:v 1 \
+    -vf "drawbox=y=160:h=320:color=0xd0c4a8:t=fill,drawgrid=y=160:w=40:h=400:t=3:color=0x100c08,drawbox=y=0:h=158:color=0xc8d8e8:t=fill,drawbox=y=300:h=180:color=0xd0c4a8:t=fill" \
+    sand.png
+  local strength
+  strength=$(strength_of sand.png)
+  [ "$strength" -le 10 ] || fail "strength $strength for a beach in clear air"
+  # The same through haze.
+  make_input -i sand.png -vf "lutrgb=r='70+val*0.65':g='70+val*0.65':b='70+val*0.65'" veiled.png
+  equal "$(strength_of veiled.png)" 100
+}
+
+case_black_things_do_not_hide_the_haze() {
+  make_hazy hazy.png 640x480 205 208 212
+  make_input -i hazy.png -vf "lutrgb=r='40+val*0.75':g='40+val*0.75':b='42+val*0.75'" thick.png
+  equal "$(strength_of thick.png)" 100
+  make_input -i thick.png -vf "drawbox=y=430:h=50:color=0x101010:t=fill" front.png
+  equal "$(strength_of front.png)" 100 "behind something black in front"
+  make_input -i thick.png -vf "pad=640:640:0:80" bars.png
+  equal "$(strength_of bars.png)" 100 "between bars"
+}
+
+case_far_haze_counts() {
+  # Nothing hazy at the bottom, where the stripes are black, and all haze at the top.
+  make_hazy hazy.png 640x480 205 208 212
+  equal "$(strength_of hazy.png)" 100
+  # The same lying on its side, with a tag that says so.
+  make_input -i hazy.png -vf transpose=clock -q:v 1 -pix_fmt yuvj444p plain.jpg
+  exif_jpeg plain.jpg turned.jpg 8
+  equal "$(strength_of turned.jpg)" 100
+}
+
+case_a_dark_thing_is_no_light() {
+  # No sky, no distance, nothing bright.
+  make_input -f lavfi -i color=0x484440:size=640x480 -frames:v 1 \
+    -vf "drawgrid=w=40:h=40:t=6:color=0x281c18,format=rgb24" dark.png
+  equal "$(strength_of dark.png)" 0
+}
+
+luma_median() {
+  ffmpeg -nostdin -v error -i "$1" -vf "format=gray" -f rawvideo - | od -An -v -w1 -tu1 | sort -n |
+    awk '{ value[NR] = $1 } END { print value[int((NR + 1) / 2)] + 0 }'
+}
+
+case_half_of_the_picture_stays_bright_enough() {
+  # A dark wood below a bright cloud.
+  make_input -f lavfi -i color=0xc8ccac:size=320x240 -frames:v 1 \
+    -vf "drawbox=y=60:h=180:color=0x404248:t=fill,drawgrid=y=60:w=16:h=300:t=6:color=0x343438,drawbox=h=58:color=0xc8ccac:t=fill,format=rgb24" \
+    wood.png
+  dehaze wood.png auto.png
+  dehaze --strength 100 wood.png all.png
+  local median
+  median=$(luma_median auto.png)
+  [ "$median" -ge 33 ] && [ "$median" -le 40 ] || fail "median $median"
+  median=$(luma_median all.png)
+  [ "$median" -lt 30 ] || fail "median $median with all taken out"
+}
+
 # Mean of a channel over the lower half, where there is something to see.
 channel_mean() { # FILE CHANNEL
   ffmpeg -nostdin -v error -i "$1" -vf "crop=iw:ih/2:0:ih/2,extractplanes=$2,scale=1:1:flags=area" \

@@ -46,8 +46,8 @@ class HazeJudge {
   const Light& light() const { return light_; }
   std::array<double, 3> exact_light() const;  // blue, green, red
 
-  // share: of the frame's haze.
-  Removal judge(const Plane& share);
+  // small: the picture that was looked at. model: its own, or a mean over frames.
+  Removal judge(BgrImage& small, const GuidedModel& model);
 
  private:
   bool is_cut(const BgrImage& small) const;
@@ -57,6 +57,8 @@ class HazeJudge {
   Orientation orientation_;
   std::array<SteadyValue, 3> light_means_;
   SteadyValue haze_;
+  SteadyValue evidence_;  // 0: clear ... 1
+  SteadyValue largest_amount_;
   Light light_ = {255, 255, 255};
   std::optional<BgrImage> last_;
 };

@@ -49,13 +49,6 @@ int window_radius(int width, int height, int part) {
   return std::max(1, std::min(std::max(width, height) / part, largest));
 }
 
-// 0 to 1 down the picture as it is seen.
-double depth_in_view(int x, int y, const BgrImage& image, const Orientation& orientation) {
-  const double depth = orientation.transposed ? static_cast<double>(x) / image.width
-                                              : static_cast<double>(y) / image.height;
-  return orientation.flipped_y ? 1 - depth : depth;
-}
-
 // How much a pixel looks like thick haze, by its dark channel and its height: `depth` goes from 0
 // to 1 down the picture.
 uint8_t haze_score(int dark, double depth) {
@@ -207,6 +200,12 @@ BgrImage reduced(const BgrImage& image) {
   return small;
 }
 
+double depth_in_view(int x, int y, const BgrImage& image, const Orientation& orientation) {
+  const double depth = orientation.transposed ? static_cast<double>(x) / image.width
+                                              : static_cast<double>(y) / image.height;
+  return orientation.flipped_y ? 1 - depth : depth;
+}
+
 Light estimate_light(BgrImage& small, const Orientation& orientation) {
   const int w = small.width;
   const int h = small.height;
@@ -236,10 +235,14 @@ GuidedModel fit_guided_model(BgrImage& small, const Light& light) {
   return fit_to_guide(shares.patch, shares.pixel);
 }
 
+Plane share_by_pixel(BgrImage& image, const Light& light) {
+  return dark_shares(image, light).pixel;
+}
+
 Plane share_of_haze(BgrImage& image, const GuidedModel& model, const Light& light) {
   const Plane slope = enlarged(model.slope, image.width, image.height);
   const Plane offset = enlarged(model.offset, image.width, image.height);
-  Plane share = dark_shares(image, light).pixel;
+  Plane share = share_by_pixel(image, light);
   const Chroma light_chroma = chroma_of(light.data());
   const uint8_t* bgr = image.bytes.data();
   for (size_t i = 0; i < share.values.size(); ++i) {

@@ -27,6 +27,9 @@ BgrImage half_resolution(Nv21Frame& frame);
 // in one direction are not halved any further.
 BgrImage reduced(const BgrImage& image);
 
+// 0 to 1 down the picture as it is seen.
+double depth_in_view(int x, int y, const BgrImage& image, const Orientation& orientation);
+
 // Colour of the thickest haze: the mean over the brightest part of the dark channel, the upper part
 // of the picture coming first.
 Light estimate_light(BgrImage& small, const Orientation& orientation);
@@ -39,6 +42,9 @@ struct GuidedModel {
 };
 
 GuidedModel fit_guided_model(BgrImage& small, const Light& light);
+
+// Largest share of haze in each pixel by itself: it would take its darkest channel to 0.
+Plane share_by_pixel(BgrImage& image, const Light& light);
 
 // Share of the haze in each pixel of an image that is the small one or one that it was made from by
 // reduced(). No share would bring a channel of the result beyond its range.

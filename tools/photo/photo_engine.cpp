@@ -19,7 +19,7 @@ void PhotoEngine::process(Nv21Frame& frame) {
     BgrImage small = reduced(half);
     if (judge_.look_at(small)) steady_model_.restart();
     const GuidedModel& model = steady_model_.follow(fit_guided_model(small, judge_.light()), small);
-    removal_ = judge_.judge(share_of_haze(small, model, judge_.light()));
+    removal_ = judge_.judge(small, model);
     codes_ = recovery_codes(share_of_haze(half, model, judge_.light()), removal_);
   }
   recover(frame, codes_, judge_.exact_light());
