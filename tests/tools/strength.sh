@@ -66,8 +66,8 @@ case_auto_tells_haze_from_clear_air() {
 case_bright_grey_things_are_not_haze() {
   # Sky, sand with dark things on its far part, bare sand in front.
   make_input -f lavfi -i "color=0xc8d8e8:size=640x480,format=rgb24" -frames:v 1 \
-    -vf "drawbox=y=160:h=320:color=0xd0c4a8:t=fill,drawgrid=y=160:w=40:h=400:t=3:color=0x100c08,drawbox=y=0:h=158:color=0xc8d8e8:t=fill,drawbox=y=300:h=180:color=0xd0c4a8:t=fill" \
-    sand.png
+    -vf "drawbox=y=160:h=320:color=0x786c58:t=fill,drawgrid=y=160:w=40:h=400:t=3:color=0x100c08,
+      drawbox=y=0:h=158:color=0xc8d8e8:t=fill,drawbox=y=300:h=180:color=0x786c58:t=fill" sand.png
   local strength
   strength=$(strength_of sand.png)
   [ "$strength" -le 10 ] || fail "strength $strength for a beach in clear air"
@@ -111,8 +111,8 @@ luma_median() {
 case_half_of_the_picture_stays_bright_enough() {
   # A dark wood below a bright cloud.
   make_input -f lavfi -i color=0xc8ccac:size=320x240 -frames:v 1 \
-    -vf "drawbox=y=60:h=180:color=0x404248:t=fill,drawgrid=y=60:w=16:h=300:t=6:color=0x343438,drawbox=h=58:color=0xc8ccac:t=fill,format=rgb24" \
-    wood.png
+    -vf "drawbox=y=60:h=180:color=0x404248:t=fill,drawgrid=y=60:w=16:h=300:t=6:color=0x343438,
+      drawbox=h=58:color=0xc8ccac:t=fill,format=rgb24" wood.png
   dehaze wood.png auto.png
   dehaze --strength 100 wood.png all.png
   local median
