@@ -31,9 +31,12 @@ constexpr double kFullVeil = 0.11;
 constexpr double kClear = 0.01;
 constexpr double kHazy = 0.08;
 
+// Hardly to be seen in a clear picture, and good for one with the thinnest haze.
+constexpr double kLeastAmount = 0.1;
+
 // The light of haze by day is brighter than the second value, in parts of white. A picture without
 // any sky or distance gives a thing's colour instead, which is mostly darker; below the first value
-// nothing is taken out.
+// none is found.
 constexpr double kNoLight = 0.3;
 constexpr double kDaylight = 0.45;
 
@@ -218,7 +221,7 @@ Removal HazeJudge::judge(BgrImage& small, const GuidedModel& model) {
       std::min(rise(veil, kClearVeil, kFullVeil), rise(hazy(scene.share), kClear, kHazy));
   evidence_.add(rise(brightness, kNoLight, kDaylight) * found, memory_);
   largest_amount_.add(std::min(largest_amount(scene, light_luma), 1.0), memory_);
-  removal.amount = std::min(evidence_.mean(), largest_amount_.mean());
+  removal.amount = std::max(std::min(evidence_.mean(), largest_amount_.mean()), kLeastAmount);
   return removal;
 }
 
