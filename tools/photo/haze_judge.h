@@ -6,6 +6,7 @@
 #include <optional>
 
 #include "media/orientation.h"
+#include "photo/haze_evidence.h"
 #include "photo/haze_map.h"
 
 namespace dehaze {
@@ -56,8 +57,9 @@ class HazeJudge {
   double memory_;
   Orientation orientation_;
   std::array<SteadyValue, 3> light_means_;
-  SteadyValue haze_;
-  SteadyValue evidence_;  // 0: clear ... 1
+  // As in HazeEvidence.
+  SteadyValue nearby_haze_;
+  SteadyValue amount_;
   SteadyValue largest_amount_;
   Light light_ = {255, 255, 255};
   std::optional<BgrImage> last_;
