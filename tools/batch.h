@@ -1,6 +1,5 @@
 // Several files, several at a time.
-#ifndef TOOLS_BATCH_H
-#define TOOLS_BATCH_H
+#pragma once
 
 #include "errors.h"
 #include "options.h"
@@ -11,5 +10,3 @@ namespace dehaze {
 ExitStatus run_batch(const Options& options);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_BATCH_H

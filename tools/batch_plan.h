@@ -1,6 +1,5 @@
 // Which files of several inputs and folders become which outputs.
-#ifndef TOOLS_BATCH_PLAN_H
-#define TOOLS_BATCH_PLAN_H
+#pragma once
 
 #include <string>
 #include <vector>
@@ -27,5 +26,3 @@ struct BatchPlan {
 BatchPlan plan_batch(const Options& options);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_BATCH_PLAN_H

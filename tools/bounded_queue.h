@@ -1,6 +1,5 @@
 // A queue between two threads that holds no more than it was made for.
-#ifndef TOOLS_BOUNDED_QUEUE_H
-#define TOOLS_BOUNDED_QUEUE_H
+#pragma once
 
 #include <condition_variable>
 #include <cstddef>
@@ -60,5 +59,3 @@ class BoundedQueue {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_BOUNDED_QUEUE_H

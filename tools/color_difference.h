@@ -1,6 +1,5 @@
 // Colours as people see them: CIE L*a*b* and the colour difference CIEDE2000.
-#ifndef TOOLS_COLOR_DIFFERENCE_H
-#define TOOLS_COLOR_DIFFERENCE_H
+#pragma once
 
 #include <cstdint>
 
@@ -24,5 +23,3 @@ double chroma(const Lab& color);
 double hue_difference(const Lab& first, const Lab& second);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_COLOR_DIFFERENCE_H

@@ -1,7 +1,6 @@
 // What the tool says while it works: notes, and on a terminal a progress line. On standard error,
 // because standard output may be the picture pipe.
-#ifndef TOOLS_CONSOLE_H
-#define TOOLS_CONSOLE_H
+#pragma once
 
 #include <string>
 #include <vector>
@@ -66,5 +65,3 @@ void print_error(const std::string& text);
 void print_info(const std::string& text);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_CONSOLE_H

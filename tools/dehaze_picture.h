@@ -1,6 +1,5 @@
 // One picture in, one picture out.
-#ifndef TOOLS_DEHAZE_PICTURE_H
-#define TOOLS_DEHAZE_PICTURE_H
+#pragma once
 
 #include "console.h"
 #include "media/reader.h"
@@ -14,5 +13,3 @@ namespace dehaze {
 Outcome dehaze_picture(Reader& reader, const Options& options, Console& console);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_DEHAZE_PICTURE_H

@@ -1,6 +1,5 @@
 // Video in, video out.
-#ifndef TOOLS_DEHAZE_VIDEO_H
-#define TOOLS_DEHAZE_VIDEO_H
+#pragma once
 
 #include "console.h"
 #include "media/reader.h"
@@ -12,5 +11,3 @@ namespace dehaze {
 Outcome dehaze_video(Reader& reader, const Options& options, Console& console);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_DEHAZE_VIDEO_H

@@ -1,8 +1,7 @@
 // What takes the haze out of frames. There are two: PreviewEngine calls the frame path of the
 // library exactly as a camera pipeline does, PhotoEngine chains the library's building blocks at
 // full resolution.
-#ifndef TOOLS_ENGINE_H
-#define TOOLS_ENGINE_H
+#pragma once
 
 #include <memory>
 #include <string>
@@ -77,5 +76,3 @@ std::unique_ptr<Engine> make_engine(EngineKind kind, const EngineOptions& option
                                     int height, const Source& source, Console& console);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_ENGINE_H

@@ -1,6 +1,5 @@
 // The part of the command line that says how the haze is removed and what of it is shown.
-#ifndef TOOLS_ENGINE_OPTIONS_H
-#define TOOLS_ENGINE_OPTIONS_H
+#pragma once
 
 #include <optional>
 #include <string>
@@ -41,5 +40,3 @@ void check_engine_options(const EngineOptions& options);
 EngineKind choose_engine(const EngineOptions& options, int width, int height, bool is_picture);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_ENGINE_OPTIONS_H

@@ -1,6 +1,5 @@
 // What can end a run early. Every message says what to do about it and names the file concerned.
-#ifndef TOOLS_ERRORS_H
-#define TOOLS_ERRORS_H
+#pragma once
 
 #include <stdexcept>
 
@@ -36,5 +35,3 @@ class Interrupted {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_ERRORS_H

@@ -1,6 +1,5 @@
 // Atmospheric light and strength of a picture or a video, without any output.
-#ifndef TOOLS_FIND_LIGHT_H
-#define TOOLS_FIND_LIGHT_H
+#pragma once
 
 #include "console.h"
 #include "media/reader.h"
@@ -13,5 +12,3 @@ namespace dehaze {
 Outcome find_light(Reader& reader, const Options& options, Console& console);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_FIND_LIGHT_H

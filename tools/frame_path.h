@@ -1,6 +1,5 @@
 // The way of every frame through an engine: to NV21, haze removal, NV21.
-#ifndef TOOLS_FRAME_PATH_H
-#define TOOLS_FRAME_PATH_H
+#pragma once
 
 #include <memory>
 
@@ -48,5 +47,3 @@ class FramePath {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_FRAME_PATH_H

@@ -1,6 +1,5 @@
 // The text of --help: examples first, because that is what most people look for.
-#ifndef TOOLS_HELP_H
-#define TOOLS_HELP_H
+#pragma once
 
 #include <CLI/CLI.hpp>
 #include <string>
@@ -19,5 +18,3 @@ class HelpFormatter : public CLI::Formatter {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_HELP_H

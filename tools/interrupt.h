@@ -1,7 +1,6 @@
 // Signals: the first one asks the run to stop and clean up, a second one removes the unfinished
 // file and ends the process at once.
-#ifndef TOOLS_INTERRUPT_H
-#define TOOLS_INTERRUPT_H
+#pragma once
 
 #include <pthread.h>
 
@@ -32,5 +31,3 @@ void wake_thread(pthread_t thread);
 void set_unfinished_file(const std::string& path);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_INTERRUPT_H

@@ -1,6 +1,5 @@
 // One JSON object on one line (RFC 8259).
-#ifndef TOOLS_JSON_H
-#define TOOLS_JSON_H
+#pragma once
 
 #include <cstdint>
 #include <string>
@@ -30,5 +29,3 @@ class JsonObject {
 std::string json_string(const std::string& text);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_JSON_H

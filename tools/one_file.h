@@ -1,6 +1,5 @@
 // One input to one output.
-#ifndef TOOLS_ONE_FILE_H
-#define TOOLS_ONE_FILE_H
+#pragma once
 
 #include <string>
 
@@ -17,5 +16,3 @@ FileResult process_file(const Options& options, Console& console);
 std::string timing_text(const Outcome& outcome);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_ONE_FILE_H

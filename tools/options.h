@@ -1,6 +1,5 @@
 // The command line.
-#ifndef TOOLS_OPTIONS_H
-#define TOOLS_OPTIONS_H
+#pragma once
 
 #include <cstdint>
 #include <optional>
@@ -41,5 +40,3 @@ struct Options {
 std::optional<Options> parse_options(int argc, char** argv);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_OPTIONS_H

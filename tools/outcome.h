@@ -1,6 +1,5 @@
 // What came of a file.
-#ifndef TOOLS_OUTCOME_H
-#define TOOLS_OUTCOME_H
+#pragma once
 
 #include <cstdint>
 #include <optional>
@@ -37,5 +36,3 @@ struct FileResult {
 std::string to_json(const FileResult& result);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_OUTCOME_H

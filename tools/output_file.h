@@ -1,6 +1,5 @@
 // An output file that appears under its own name only when it is complete.
-#ifndef TOOLS_OUTPUT_FILE_H
-#define TOOLS_OUTPUT_FILE_H
+#pragma once
 
 #include <string>
 
@@ -32,5 +31,3 @@ class OutputFile {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_OUTPUT_FILE_H

@@ -1,6 +1,5 @@
 // The kinds of output files.
-#ifndef TOOLS_OUTPUT_KIND_H
-#define TOOLS_OUTPUT_KIND_H
+#pragma once
 
 #include <optional>
 #include <string>
@@ -28,5 +27,3 @@ std::optional<OutputKind> known_output_kind(const std::string& path);
 OutputKind output_kind_of(const std::string& path);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_OUTPUT_KIND_H

@@ -1,6 +1,5 @@
 // How close one picture is to another.
-#ifndef TOOLS_PICTURE_METRICS_H
-#define TOOLS_PICTURE_METRICS_H
+#pragma once
 
 #include <cstdint>
 #include <vector>
@@ -33,5 +32,3 @@ double mean_hue_shift(const RgbPicture& reference, const RgbPicture& picture);
 double clipped_share(const RgbPicture& picture);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PICTURE_METRICS_H

@@ -1,6 +1,5 @@
 // The library's frame path: one session, opened for one frame size, closed at the end of the scope.
-#ifndef TOOLS_PREVIEW_ENGINE_H
-#define TOOLS_PREVIEW_ENGINE_H
+#pragma once
 
 #include <optional>
 
@@ -31,5 +30,3 @@ class PreviewEngine : public Engine {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PREVIEW_ENGINE_H

@@ -1,6 +1,5 @@
 // Lines for other programs.
-#ifndef TOOLS_PRINT_LINE_H
-#define TOOLS_PRINT_LINE_H
+#pragma once
 
 #include <cstdio>
 #include <string>
@@ -12,5 +11,3 @@ namespace dehaze {
 void print_line(std::FILE* file, const std::string& line);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PRINT_LINE_H

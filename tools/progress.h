@@ -1,6 +1,5 @@
 // Progress of a file: frames or steps, share done, speed and time left.
-#ifndef TOOLS_PROGRESS_H
-#define TOOLS_PROGRESS_H
+#pragma once
 
 #include <chrono>
 #include <cstdint>
@@ -50,5 +49,3 @@ std::string progress_text(const std::string& unit, int64_t done, int64_t total, 
 std::string duration_text(int64_t seconds);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PROGRESS_H

@@ -1,6 +1,5 @@
 // Raw 4:2:0 frames: what nothing in the data says and the command line has to.
-#ifndef TOOLS_RAW_FORMAT_H
-#define TOOLS_RAW_FORMAT_H
+#pragma once
 
 #include <string>
 
@@ -31,5 +30,3 @@ RawFormat parse_raw_format(const std::string& text);
 RawLayout parse_raw_layout(const std::string& text);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_RAW_FORMAT_H

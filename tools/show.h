@@ -1,6 +1,5 @@
 // Views of what an engine did, in place of its result.
-#ifndef TOOLS_SHOW_H
-#define TOOLS_SHOW_H
+#pragma once
 
 #include <string>
 #include <vector>
@@ -22,5 +21,3 @@ void draw_compare(const Nv21Frame& before, Nv21Frame& frame);
 std::string describe(const HazeFindings& findings);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_SHOW_H

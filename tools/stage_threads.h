@@ -1,7 +1,6 @@
 // Stages of one job, each on a thread of its own, that end together: by success, or when one of
 // them fails or a signal arrives.
-#ifndef TOOLS_STAGE_THREADS_H
-#define TOOLS_STAGE_THREADS_H
+#pragma once
 
 #include <condition_variable>
 #include <cstddef>
@@ -42,5 +41,3 @@ class StageThreads {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_STAGE_THREADS_H

@@ -1,8 +1,7 @@
 // A child process that works on one file. The library has one session per process, so files are
 // processed side by side by processes. The child goes on from fork() with the parsed command line
 // as it is; the parent has no threads and no open media at that time.
-#ifndef TOOLS_WORKER_H
-#define TOOLS_WORKER_H
+#pragma once
 
 #include <sys/types.h>
 
@@ -59,5 +58,3 @@ class Worker {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_WORKER_H

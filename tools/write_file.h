@@ -1,5 +1,4 @@
-#ifndef TOOLS_WRITE_FILE_H
-#define TOOLS_WRITE_FILE_H
+#pragma once
 
 #include <cstddef>
 #include <string>
@@ -10,5 +9,3 @@ namespace dehaze {
 bool write_file(const std::string& path, const void* bytes, size_t size);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_WRITE_FILE_H

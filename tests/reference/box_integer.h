@@ -1,6 +1,5 @@
 // Window means on 8-bit images, written as means of windows cut off at the image border.
-#ifndef HAZE_TESTS_REFERENCE_BOX_INTEGER_H
-#define HAZE_TESTS_REFERENCE_BOX_INTEGER_H
+#pragma once
 
 #include <cstdint>
 #include <vector>
@@ -29,5 +28,3 @@ std::vector<int> box_column_sums_at_end(const uint8_t* src, int width, int heigh
                                         BoxWindow window);
 
 }  // namespace haze::reference
-
-#endif

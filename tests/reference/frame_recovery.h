@@ -1,6 +1,5 @@
 // Per-byte definition of the recovery J = A + (I - A) / t of YUV 4:2:0 frames.
-#ifndef HAZE_TESTS_REFERENCE_FRAME_RECOVERY_H
-#define HAZE_TESTS_REFERENCE_FRAME_RECOVERY_H
+#pragma once
 
 #include <cstdint>
 
@@ -31,5 +30,3 @@ void recover_planar(uint8_t* frame, const uint8_t* codes, const uint8_t* light_b
                     int height);
 
 }  // namespace haze::reference
-
-#endif

@@ -1,7 +1,6 @@
 // Per-sample definition of the half-resolution minimum and maximum colour channels of an NV21
 // frame.
-#ifndef HAZE_TESTS_REFERENCE_MAX_MIN_NV21_H
-#define HAZE_TESTS_REFERENCE_MAX_MIN_NV21_H
+#pragma once
 
 #include <cstdint>
 
@@ -21,5 +20,3 @@ void max_min_nv21(const uint8_t* luma, const uint8_t* chroma, uint8_t* min_out, 
                   int width, int height);
 
 }  // namespace haze::reference
-
-#endif

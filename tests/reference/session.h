@@ -1,6 +1,5 @@
 // The session and its frame driver with state of its own, written from the formulas.
-#ifndef HAZE_TESTS_REFERENCE_SESSION_H
-#define HAZE_TESTS_REFERENCE_SESSION_H
+#pragma once
 
 #include <array>
 #include <cstddef>
@@ -58,5 +57,3 @@ class ReferenceSession {
 };
 
 }  // namespace haze::reference
-
-#endif

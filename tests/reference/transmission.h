@@ -1,7 +1,6 @@
 // Per-pixel definition of the 8-bit transmission map: T = trunc(200 t - 40) for t clamped to [0.4,
 // 0.99].
-#ifndef HAZE_TESTS_REFERENCE_TRANSMISSION_H
-#define HAZE_TESTS_REFERENCE_TRANSMISSION_H
+#pragma once
 
 #include <cstdint>
 
@@ -35,5 +34,3 @@ struct StripeRows {
 StripeRows transmission_stripe(int height, int stripe);
 
 }  // namespace haze::reference
-
-#endif

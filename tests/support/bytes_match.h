@@ -1,6 +1,5 @@
 // Byte for byte comparison that tells the arguments, the first difference and its surroundings.
-#ifndef HAZE_TESTS_SUPPORT_BYTES_MATCH_H
-#define HAZE_TESTS_SUPPORT_BYTES_MATCH_H
+#pragma once
 
 #include <gtest/gtest.h>
 
@@ -39,5 +38,3 @@ using Arguments = std::initializer_list<Argument>;
                                          const Arguments& arguments = {});
 
 }  // namespace haze::test
-
-#endif

@@ -1,6 +1,5 @@
 // FNV-1a, 64 bits: a digest for golden results.
-#ifndef HAZE_TESTS_SUPPORT_FNV1A_H
-#define HAZE_TESTS_SUPPORT_FNV1A_H
+#pragma once
 
 #include <cstddef>
 #include <cstdint>
@@ -19,5 +18,3 @@ class Fnv1a {
 };
 
 }  // namespace haze::test
-
-#endif

@@ -1,6 +1,5 @@
 // Buffers that end exactly where the contract says.
-#ifndef HAZE_TESTS_SUPPORT_GUARDED_BUFFER_H
-#define HAZE_TESTS_SUPPORT_GUARDED_BUFFER_H
+#pragma once
 
 #include <gtest/gtest.h>
 
@@ -68,5 +67,3 @@ class PageEndBuffer {
 };
 
 }  // namespace haze::test
-
-#endif

@@ -1,6 +1,5 @@
 // Kinds of test images, from flat extremes to rough ones.
-#ifndef HAZE_TESTS_SUPPORT_MOODS_H
-#define HAZE_TESTS_SUPPORT_MOODS_H
+#pragma once
 
 #include <cstdint>
 #include <vector>
@@ -26,5 +25,3 @@ std::vector<uint8_t> make_frame(Random& random, Mood luma, Colours colours, int 
 std::vector<uint8_t> make_hazy_frame(Random& random, int width, int height);
 
 }  // namespace haze::test
-
-#endif

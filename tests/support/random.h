@@ -1,7 +1,6 @@
 // A generator of our own (SplitMix64), so that a seed gives the same inputs on every target and
 // library.
-#ifndef HAZE_TESTS_SUPPORT_RANDOM_H
-#define HAZE_TESTS_SUPPORT_RANDOM_H
+#pragma once
 
 #include <cstdint>
 
@@ -40,5 +39,3 @@ class Random {
 uint64_t test_seed();
 
 }  // namespace haze::test
-
-#endif

@@ -1,6 +1,5 @@
 // The library's session and the reference's, driven side by side and compared after every call.
-#ifndef HAZE_TESTS_SUPPORT_SESSION_PAIR_H
-#define HAZE_TESTS_SUPPORT_SESSION_PAIR_H
+#pragma once
 
 #include <cstdint>
 #include <vector>
@@ -44,5 +43,3 @@ class SessionPair {
 };
 
 }  // namespace haze::test
-
-#endif

@@ -1,6 +1,5 @@
 // Errors of FFmpeg's libraries: result codes become exceptions, log lines become their detail.
-#ifndef TOOLS_MEDIA_AV_ERROR_H
-#define TOOLS_MEDIA_AV_ERROR_H
+#pragma once
 
 #include <cstdint>
 #include <string>
@@ -22,5 +21,3 @@ std::string take_last_logged_error();
 int check(int result, const std::string& what);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_AV_ERROR_H

@@ -1,6 +1,5 @@
 // Numbers in files, by byte order.
-#ifndef TOOLS_MEDIA_BYTE_ORDER_H
-#define TOOLS_MEDIA_BYTE_ORDER_H
+#pragma once
 
 #include <cstddef>
 #include <cstdint>
@@ -52,5 +51,3 @@ inline std::vector<uint8_t> part_of(const std::vector<uint8_t>& bytes, size_t be
 }
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_BYTE_ORDER_H

@@ -3,8 +3,7 @@
 // The conversion is done by zscale (the zimg library) because each of its steps is computed at
 // higher precision and rounded once, and because it can leave 4:2:0 chroma on its grid: README.md
 // has the measured round trips. Where the values mean the same on both sides they are only copied.
-#ifndef TOOLS_MEDIA_COLOR_CONVERT_H
-#define TOOLS_MEDIA_COLOR_CONVERT_H
+#pragma once
 
 #include <memory>
 
@@ -59,5 +58,3 @@ class FromNv21 {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_COLOR_CONVERT_H

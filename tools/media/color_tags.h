@@ -1,6 +1,5 @@
 // What the sample values of a frame mean: tags where there are any, the usual guesses elsewhere.
-#ifndef TOOLS_MEDIA_COLOR_TAGS_H
-#define TOOLS_MEDIA_COLOR_TAGS_H
+#pragma once
 
 #include "media/ffmpeg_handles.h"
 
@@ -37,5 +36,3 @@ bool is_420(AVPixelFormat format);
 bool is_floating_point(AVPixelFormat format);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_COLOR_TAGS_H

@@ -1,7 +1,6 @@
 // The tracks of an output video besides the picture: sound, subtitles and their fonts, packet by
 // packet from the input.
-#ifndef TOOLS_MEDIA_COMPANION_TRACKS_H
-#define TOOLS_MEDIA_COMPANION_TRACKS_H
+#pragma once
 
 #include <cstdint>
 #include <deque>
@@ -47,5 +46,3 @@ class CompanionTracks {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_COMPANION_TRACKS_H

@@ -1,6 +1,5 @@
 // What cameras write about a picture.
-#ifndef TOOLS_MEDIA_EXIF_H
-#define TOOLS_MEDIA_EXIF_H
+#pragma once
 
 #include <string>
 
@@ -16,5 +15,3 @@ Bytes read_exif(const std::string& path);
 bool make_exif_upright(Bytes& exif, int width, int height);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_EXIF_H

@@ -1,6 +1,5 @@
 // Owners for the objects of FFmpeg's libraries.
-#ifndef TOOLS_MEDIA_FFMPEG_HANDLES_H
-#define TOOLS_MEDIA_FFMPEG_HANDLES_H
+#pragma once
 
 extern "C" {
 #include <libavcodec/avcodec.h>
@@ -72,5 +71,3 @@ class Dictionary {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_FFMPEG_HANDLES_H

@@ -1,6 +1,5 @@
 // A filter graph with one input and one output that gives one frame for each frame.
-#ifndef TOOLS_MEDIA_FILTER_PIPE_H
-#define TOOLS_MEDIA_FILTER_PIPE_H
+#pragma once
 
 #include <string>
 
@@ -25,5 +24,3 @@ class FilterPipe {
 FramePtr run_filter(const AVFrame& frame, const std::string& description);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_FILTER_PIPE_H

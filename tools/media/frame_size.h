@@ -1,6 +1,5 @@
 // Which part of an input frame reaches the library at which size.
-#ifndef TOOLS_MEDIA_FRAME_SIZE_H
-#define TOOLS_MEDIA_FRAME_SIZE_H
+#pragma once
 
 #include <cstdint>
 
@@ -39,5 +38,3 @@ FrameSize fit_frame_size(int width, int height);
 FrameSize whole_frame_size(int width, int height);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_FRAME_SIZE_H

@@ -1,6 +1,5 @@
 // Titles, dates, languages and the like, from one container to another.
-#ifndef TOOLS_MEDIA_METADATA_H
-#define TOOLS_MEDIA_METADATA_H
+#pragma once
 
 #include "media/ffmpeg_handles.h"
 
@@ -15,5 +14,3 @@ void copy_stream_metadata(const AVStream& from, AVStream& to);
 void copy_chapters(const AVFormatContext& from, AVFormatContext& to, int64_t start, int64_t length);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_METADATA_H

@@ -1,6 +1,5 @@
 // The library's frame and its exchange with the planar frames of FFmpeg's libraries.
-#ifndef TOOLS_MEDIA_NV21_H
-#define TOOLS_MEDIA_NV21_H
+#pragma once
 
 #include <cstdint>
 #include <vector>
@@ -33,5 +32,3 @@ FramePtr pad_to_even(const AVFrame& frame);
 bool has_fixed_pixel_step(AVPixelFormat format);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_NV21_H

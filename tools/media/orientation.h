@@ -1,7 +1,6 @@
 // How stored pixels have to be turned for display: the display matrix of video containers and the
 // orientation tag of EXIF.
-#ifndef TOOLS_MEDIA_ORIENTATION_H
-#define TOOLS_MEDIA_ORIENTATION_H
+#pragma once
 
 #include <cstdint>
 #include <string>
@@ -34,5 +33,3 @@ Orientation orientation_of(const AVStream& stream, const AVFrame& frame);
 const int32_t* display_matrix(const AVStream& stream);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_ORIENTATION_H

@@ -1,7 +1,6 @@
 // The blocks of picture files that lie beside the pixels and that FFmpeg's encoders leave out: EXIF
 // in JPEG, PNG and WebP, the colour profile in WebP.
-#ifndef TOOLS_MEDIA_PICTURE_BLOCKS_H
-#define TOOLS_MEDIA_PICTURE_BLOCKS_H
+#pragma once
 
 #include <cstdint>
 #include <vector>
@@ -29,5 +28,3 @@ Bytes webp_with_blocks(const Bytes& file, const Bytes& exif, const Bytes& profil
                        int height);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_PICTURE_BLOCKS_H

@@ -1,6 +1,5 @@
 // Raw 4:2:0 frames among the formats of FFmpeg's libraries.
-#ifndef TOOLS_MEDIA_RAW_FRAMES_H
-#define TOOLS_MEDIA_RAW_FRAMES_H
+#pragma once
 
 #include "media/ffmpeg_handles.h"
 #include "raw_format.h"
@@ -19,5 +18,3 @@ void set_raw_options(const RawFormat& format, Dictionary& options);
 void set_raw_meaning(const RawFormat& format, AVCodecParameters& stream);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_RAW_FRAMES_H

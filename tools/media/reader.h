@@ -1,7 +1,6 @@
 // Input: a picture, a video or a pipe, as decoded frames and untouched packets of what goes with
 // them: sound and subtitles.
-#ifndef TOOLS_MEDIA_READER_H
-#define TOOLS_MEDIA_READER_H
+#pragma once
 
 #include <deque>
 #include <optional>
@@ -74,5 +73,3 @@ class Reader {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_READER_H

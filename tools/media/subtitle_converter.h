@@ -1,6 +1,5 @@
 // Text subtitles from the form of one container to that of another.
-#ifndef TOOLS_MEDIA_SUBTITLE_CONVERTER_H
-#define TOOLS_MEDIA_SUBTITLE_CONVERTER_H
+#pragma once
 
 #include "media/ffmpeg_handles.h"
 
@@ -25,5 +24,3 @@ class SubtitleConverter {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_SUBTITLE_CONVERTER_H

@@ -1,6 +1,5 @@
 // The alpha channel of a picture, which goes around the haze removal.
-#ifndef TOOLS_MEDIA_TRANSPARENCY_H
-#define TOOLS_MEDIA_TRANSPARENCY_H
+#pragma once
 
 #include "media/ffmpeg_handles.h"
 
@@ -14,5 +13,3 @@ FramePtr take_alpha(const AVFrame& frame, int width, int height);
 FramePtr with_alpha(const AVFrame& picture, const AVFrame& alpha);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_TRANSPARENCY_H

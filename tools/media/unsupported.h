@@ -1,6 +1,5 @@
 // Kinds of files that people have and that FFmpeg's libraries misread or do not read.
-#ifndef TOOLS_MEDIA_UNSUPPORTED_H
-#define TOOLS_MEDIA_UNSUPPORTED_H
+#pragma once
 
 #include <string>
 
@@ -11,5 +10,3 @@ namespace dehaze {
 std::string unsupported_kind(const std::string& path);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_UNSUPPORTED_H

@@ -1,6 +1,5 @@
 // Output: one picture as a JPEG, PNG or WebP file.
-#ifndef TOOLS_MEDIA_WRITER_PICTURE_H
-#define TOOLS_MEDIA_WRITER_PICTURE_H
+#pragma once
 
 #include <string>
 
@@ -21,5 +20,3 @@ void write_picture(const AVFrame& frame, OutputKind kind, const std::string& pat
                    const Bytes& exif = {});
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_WRITER_PICTURE_H

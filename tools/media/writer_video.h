@@ -1,7 +1,6 @@
 // Output: H.264 in MP4, MOV or MKV with copied sound and subtitles; Y4M or raw frames as a file or
 // on a pipe.
-#ifndef TOOLS_MEDIA_WRITER_VIDEO_H
-#define TOOLS_MEDIA_WRITER_VIDEO_H
+#pragma once
 
 #include <cstdint>
 #include <deque>
@@ -91,5 +90,3 @@ class VideoWriter {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_MEDIA_WRITER_VIDEO_H

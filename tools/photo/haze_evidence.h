@@ -1,6 +1,5 @@
 // What a single picture shows of haze.
-#ifndef TOOLS_PHOTO_HAZE_EVIDENCE_H
-#define TOOLS_PHOTO_HAZE_EVIDENCE_H
+#pragma once
 
 #include <array>
 
@@ -24,5 +23,3 @@ HazeEvidence find_haze(BgrImage& small, const GuidedModel& model, const Light& l
                        const std::array<double, 3>& exact_light, const Orientation& orientation);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PHOTO_HAZE_EVIDENCE_H

@@ -1,6 +1,5 @@
 // How strongly the haze is to be taken out, and what stays the same from frame to frame.
-#ifndef TOOLS_PHOTO_HAZE_JUDGE_H
-#define TOOLS_PHOTO_HAZE_JUDGE_H
+#pragma once
 
 #include <array>
 #include <optional>
@@ -66,5 +65,3 @@ class HazeJudge {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PHOTO_HAZE_JUDGE_H

@@ -6,8 +6,7 @@
 // brings the edges of the picture back into that map of squares. Both work on a small copy of the
 // picture, so that "neighbourhood" means the same part of the view whatever the resolution; what
 // the guided filter learns there is applied at half resolution (as in "Fast guided filter", 2015).
-#ifndef TOOLS_PHOTO_HAZE_MAP_H
-#define TOOLS_PHOTO_HAZE_MAP_H
+#pragma once
 
 #include <array>
 
@@ -51,5 +50,3 @@ Plane share_by_pixel(BgrImage& image, const Light& light);
 Plane share_of_haze(BgrImage& image, const GuidedModel& model, const Light& light);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PHOTO_HAZE_MAP_H

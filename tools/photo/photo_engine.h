@@ -1,6 +1,5 @@
 // Haze removal at full resolution, from the library's building blocks.
-#ifndef TOOLS_PHOTO_PHOTO_ENGINE_H
-#define TOOLS_PHOTO_PHOTO_ENGINE_H
+#pragma once
 
 #include <cstdint>
 #include <optional>
@@ -29,5 +28,3 @@ class PhotoEngine : public Engine {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PHOTO_PHOTO_ENGINE_H

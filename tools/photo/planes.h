@@ -1,6 +1,5 @@
 // The images that the photo engine works on.
-#ifndef TOOLS_PHOTO_PLANES_H
-#define TOOLS_PHOTO_PLANES_H
+#pragma once
 
 #include <cstddef>
 #include <cstdint>
@@ -32,5 +31,3 @@ struct Plane {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PHOTO_PLANES_H

@@ -1,6 +1,5 @@
 // Keeps the noise of a video out of the haze map.
-#ifndef TOOLS_PHOTO_STEADY_MODEL_H
-#define TOOLS_PHOTO_STEADY_MODEL_H
+#pragma once
 
 #include <optional>
 #include <vector>
@@ -26,5 +25,3 @@ class SteadyModel {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PHOTO_STEADY_MODEL_H

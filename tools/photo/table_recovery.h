@@ -1,6 +1,5 @@
 // Recovery through the library's slot tables, filled with plain J = A + (I - A) / t.
-#ifndef TOOLS_PHOTO_TABLE_RECOVERY_H
-#define TOOLS_PHOTO_TABLE_RECOVERY_H
+#pragma once
 
 #include <array>
 #include <cstdint>
@@ -22,5 +21,3 @@ float transmission_of_code(uint8_t code);
 void recover(Nv21Frame& frame, std::vector<uint8_t>& codes, const std::array<double, 3>& light);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_PHOTO_TABLE_RECOVERY_H

@@ -1,7 +1,6 @@
 // Charts as inline SVG. The drawing stretches with the page; the labels are text beside it, so that
 // they keep their size on a phone.
-#ifndef TOOLS_REPORT_CHART_H
-#define TOOLS_REPORT_CHART_H
+#pragma once
 
 #include <string>
 #include <vector>
@@ -34,5 +33,3 @@ std::string draw_histogram(const std::string& title, const Tones& tones);
 std::string time_text(double seconds, bool has_times);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_CHART_H

@@ -1,6 +1,5 @@
 // Runs the haze removal for a report.
-#ifndef TOOLS_REPORT_COLLECT_H
-#define TOOLS_REPORT_COLLECT_H
+#pragma once
 
 #include "console.h"
 #include "report/data.h"
@@ -11,5 +10,3 @@ namespace dehaze {
 ReportData collect_report(const ReportOptions& options, Console& console);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_COLLECT_H

@@ -1,6 +1,5 @@
 // What a report tells.
-#ifndef TOOLS_REPORT_DATA_H
-#define TOOLS_REPORT_DATA_H
+#pragma once
 
 #include <cstdint>
 #include <optional>
@@ -54,5 +53,3 @@ struct ReportData {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_DATA_H

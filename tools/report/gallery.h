@@ -1,6 +1,5 @@
 // A few frames spread evenly over a video whose length may turn out to be another than expected.
-#ifndef TOOLS_REPORT_GALLERY_H
-#define TOOLS_REPORT_GALLERY_H
+#pragma once
 
 #include <cstdint>
 #include <vector>
@@ -27,5 +26,3 @@ class Gallery {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_GALLERY_H

@@ -1,6 +1,5 @@
 // Text that becomes part of a page.
-#ifndef TOOLS_REPORT_HTML_H
-#define TOOLS_REPORT_HTML_H
+#pragma once
 
 #include <string>
 
@@ -17,5 +16,3 @@ std::string jpeg_uri(const std::string& bytes);
 std::string number(double value, int decimals);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_HTML_H

@@ -1,6 +1,5 @@
 // Pictures small enough to be part of a page.
-#ifndef TOOLS_REPORT_JPEG_H
-#define TOOLS_REPORT_JPEG_H
+#pragma once
 
 #include <cstddef>
 #include <string>
@@ -26,5 +25,3 @@ struct Jpeg {
 Jpeg jpeg_within(const AVFrame& rgb, AVRational pixel_aspect, const JpegLimits& limits);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_JPEG_H

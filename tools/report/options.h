@@ -1,6 +1,5 @@
 // The command line of `dehaze report`.
-#ifndef TOOLS_REPORT_OPTIONS_H
-#define TOOLS_REPORT_OPTIONS_H
+#pragma once
 
 #include <cstdint>
 #include <optional>
@@ -31,5 +30,3 @@ bool asks_for_report(int argc, char** argv);
 std::optional<ReportOptions> parse_report_options(int argc, char** argv);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_OPTIONS_H

@@ -1,6 +1,5 @@
 // A report as an HTML page that needs no other file and no network.
-#ifndef TOOLS_REPORT_PAGE_H
-#define TOOLS_REPORT_PAGE_H
+#pragma once
 
 #include <string>
 
@@ -11,5 +10,3 @@ namespace dehaze {
 std::string report_page(const ReportData& data);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_PAGE_H

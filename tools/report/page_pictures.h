@@ -1,6 +1,5 @@
 // The parts of a page that show pictures and charts.
-#ifndef TOOLS_REPORT_PAGE_PICTURES_H
-#define TOOLS_REPORT_PAGE_PICTURES_H
+#pragma once
 
 #include <string>
 
@@ -21,5 +20,3 @@ std::string findings(const ReportData& data);
 std::string over_time(const ReportData& data);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_PAGE_PICTURES_H

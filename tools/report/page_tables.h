@@ -1,6 +1,5 @@
 // The parts of a page that are figures and words.
-#ifndef TOOLS_REPORT_PAGE_TABLES_H
-#define TOOLS_REPORT_PAGE_TABLES_H
+#pragma once
 
 #include <string>
 
@@ -21,5 +20,3 @@ std::string settings(const ReportData& data);
 std::string notes(const ReportData& data);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_PAGE_TABLES_H

@@ -1,6 +1,5 @@
 // How close a picture comes to one of the same scene without haze.
-#ifndef TOOLS_REPORT_QUALITY_H
-#define TOOLS_REPORT_QUALITY_H
+#pragma once
 
 #include "media/ffmpeg_handles.h"
 #include "picture_metrics.h"
@@ -23,5 +22,3 @@ constexpr int kSmallestComparedSide = 11;  // the window of the SSIM
 Quality quality_of(const RgbPicture& picture, const RgbPicture& clear);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_QUALITY_H

@@ -1,6 +1,5 @@
 // The scene without haze, frame by frame.
-#ifndef TOOLS_REPORT_REFERENCE_H
-#define TOOLS_REPORT_REFERENCE_H
+#pragma once
 
 #include <string>
 
@@ -29,5 +28,3 @@ class Reference {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_REFERENCE_H

@@ -1,6 +1,5 @@
 // `dehaze report`: what the haze removal does to a picture or a video, as one page.
-#ifndef TOOLS_REPORT_RUN_H
-#define TOOLS_REPORT_RUN_H
+#pragma once
 
 #include "errors.h"
 
@@ -10,5 +9,3 @@ namespace dehaze {
 ExitStatus run_report(int argc, char** argv);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_RUN_H

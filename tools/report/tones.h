@@ -1,6 +1,5 @@
 // How the tones of a picture are spread.
-#ifndef TOOLS_REPORT_TONES_H
-#define TOOLS_REPORT_TONES_H
+#pragma once
 
 #include <array>
 #include <cstdint>
@@ -24,5 +23,3 @@ struct Tones {
 Tones tones_of(const RgbPicture& picture);
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_TONES_H

@@ -1,6 +1,5 @@
 // From a frame before and after haze removal to what a page shows of it.
-#ifndef TOOLS_REPORT_VIEW_MAKER_H
-#define TOOLS_REPORT_VIEW_MAKER_H
+#pragma once
 
 #include <string>
 
@@ -35,5 +34,3 @@ class ViewMaker {
 };
 
 }  // namespace dehaze
-
-#endif  // TOOLS_REPORT_VIEW_MAKER_H
