@@ -1,3 +1,4 @@
+// A whole file at a time.
 #pragma once
 
 #include <cstddef>
