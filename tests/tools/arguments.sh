@@ -160,7 +160,7 @@ case_progress_of_a_pipe_on_a_narrow_terminal() {
 case_progress_in_hours() {
   command -v script >/dev/null || skip "script(1) is not installed"
   truncate -s 4T in.raw || skip "the file system has no files of that size"
-  script -qec "timeout -s INT 3 $DEHAZE --raw 160x160 in.raw out.mkv" typescript >/dev/null </dev/null || true
+  script -qec "timeout --foreground -s INT 3 $DEHAZE --raw 160x160 in.raw out.mkv" typescript >/dev/null </dev/null || true
   grep -Eaq '[0-9]+/[0-9]+ frames, 0 %, [0-9.]+ frames/s, [0-9]+:[0-5][0-9]:[0-5][0-9] left' typescript ||
     fail "no progress line in: $(cat -v typescript)"
   only_files in.raw typescript
