@@ -17,13 +17,16 @@ open(sys.argv[2], "wb").write(b"RIFF" + struct.pack("<I", len(blocks)) + blocks)
 PYTHON
 }
 
+# EXIF orientations, each with the filter that makes a picture upright.
+kTurns='1:null 2:hflip 3:hflip,vflip 4:vflip 5:transpose=0 6:transpose=clock 7:transpose=3
+  8:transpose=cclock'
+
 # At a level nothing is judged. Left to itself, the tool looks for the light where up is.
 case_exif_orientation() {
   make_picture plain.jpg 321x200 yuvj420p
   dehaze --level 10 plain.jpg upright.png
   local turn
-  for turn in 1:null 2:hflip 3:hflip,vflip 4:vflip 5:transpose=0 6:transpose=clock \
-    7:transpose=3 8:transpose=cclock; do
+  for turn in $kTurns; do
     exif_jpeg plain.jpg in.jpg "${turn%%:*}"
     make_input -i upright.png -vf "${turn#*:}" want.png
     dehaze --force --level 10 in.jpg out.png
@@ -40,8 +43,7 @@ case_exif_orientation_of_webp() {
   make_picture plain.webp 322x200 yuv420p
   dehaze --level 10 plain.webp upright.png
   local turn
-  for turn in 1:null 2:hflip 3:hflip,vflip 4:vflip 5:transpose=0 6:transpose=clock \
-    7:transpose=3 8:transpose=cclock; do
+  for turn in $kTurns; do
     exif_webp plain.webp in.webp "${turn%%:*}"
     make_input -i upright.png -vf "${turn#*:}" want.png
     dehaze --force --level 10 in.webp out.png
