@@ -4,13 +4,13 @@
 #include "frame_path.h"
 #include "interrupt.h"
 #include "media/av_error.h"
-#include "media/color_convert.h"
 #include "media/exif.h"
 #include "media/filter_pipe.h"
 #include "media/orientation.h"
 #include "media/transparency.h"
 #include "media/writer_picture.h"
 #include "output_file.h"
+#include "picture_result.h"
 #include "progress.h"
 
 namespace dehaze {
@@ -50,17 +50,18 @@ Outcome dehaze_picture(Reader& reader, const Options& options, Console& console)
   const Orientation orientation = orientation_of(reader.video(), *frame);
   FramePath path(*frame, source_of(reader, *frame), options.engine, console);
   const FrameSize& size = path.size();
+  if (keeps_fine_color(path, *frame)) path.keep_input();
   progress.begin("taking the haze out");
-  const Nv21Frame& nv21 = path.run(*frame);
+  path.run(*frame);
 
   progress.begin("converting the result");
   OutputSamples samples = picture_samples(options.output_kind, path.siting());
   // Turning a 4:2:0 picture of an odd size would put its chroma half a sample off.
-  if (samples.format == AV_PIX_FMT_YUVJ420P && size.is_padded() && !orientation.is_upright()) {
+  const bool is_moved = size.is_padded() && !orientation.is_upright();
+  if (samples.format == AV_PIX_FMT_YUVJ420P && (keeps_fine_color(path, *frame) || is_moved)) {
     samples.format = AV_PIX_FMT_YUVJ444P;
   }
-  FramePtr picture =
-      FromNv21(size.visible_width, size.visible_height, path.siting(), samples).convert(nv21);
+  FramePtr picture = after_in(path, *frame, samples);
 
   const FramePtr alpha = take_alpha(*frame, size.visible_width, size.visible_height);
   if (alpha && options.output_kind == OutputKind::kJpeg) {

@@ -1,6 +1,5 @@
 #include "frame_path.h"
 
-#include <optional>
 #include <string>
 
 #include "media/color_tags.h"
@@ -54,14 +53,17 @@ FramePath::FramePath(const AVFrame& first, const Source& source, const EngineOpt
 
 FramePath::FramePath(EngineKind kind, const AVFrame& first, const Source& source,
                      const EngineOptions& options, Console& console)
-    : size_(engine_frame_size(kind, first.width, first.height)),
+    : kind_(kind),
+      size_(engine_frame_size(kind, first.width, first.height)),
       siting_(meaning_of(first, source.is_picture).siting),
+      is_picture_(source.is_picture),
       show_(options.show),
       console_(console),
       to_nv21_(size_, source.is_picture, siting_),
       engine_(
           make_engine(kind, options, size_.padded_width(), size_.padded_height(), source, console)),
       nv21_(size_.padded_width(), size_.padded_height()) {
+  if (show_ == Show::kCompare) keep_input();
   note_losses(first, size_, console);
 }
 
@@ -72,12 +74,26 @@ const Nv21Frame& FramePath::run(const AVFrame& frame) {
                   std::to_string(size_.visible_width) + " x " +
                   std::to_string(size_.visible_height));
   }
-  std::optional<Nv21Frame> before;
-  if (show_ == Show::kCompare) before = nv21_;
+  if (input_) input_->bytes = nv21_.bytes;
   engine_->process(nv21_);
   if (show_ == Show::kMap) draw_map(engine_->transmission(), nv21_);
-  if (before) draw_compare(*before, nv21_);
+  if (show_ == Show::kCompare) draw_compare(*input_, nv21_);
   return nv21_;
+}
+
+void FramePath::keep_input() {
+  if (!input_) input_.emplace(nv21_.width, nv21_.height);
+}
+
+bool FramePath::has_detail() const {
+  return is_picture_ && kind_ == EngineKind::kPhoto && show_ != Show::kMap;
+}
+
+std::vector<float> FramePath::detail_gain() const {
+  std::vector<float> gain = engine_->transmission();
+  for (float& value : gain) value = 1 / value;
+  if (show_ == Show::kCompare) draw_compare_gain(gain, nv21_.width);
+  return gain;
 }
 
 }  // namespace dehaze

@@ -2,6 +2,8 @@
 #pragma once
 
 #include <memory>
+#include <optional>
+#include <vector>
 
 #include "console.h"
 #include "engine.h"
@@ -29,20 +31,38 @@ class FramePath {
   AVChromaLocation siting() const { return siting_; }
   const Engine& engine() const { return *engine_; }
 
+  // From the next frame on there is an input().
+  void keep_input();
+
   // The result, or what is to be shown instead of it; valid until the next call.
   const Nv21Frame& run(const AVFrame& frame);
+
+  // Of the last frame.
+  const Nv21Frame& input() const { return *input_; }
+  const Nv21Frame& result() const { return nv21_; }
+
+  // True for pictures by the photo engine. What the preview engine makes is what a camera's screen
+  // shows, and a map has nothing of the picture.
+  bool has_detail() const;
+
+  // How many times stronger than in the last frame its finest detail is in the result, for each
+  // 2 x 2 pixels.
+  std::vector<float> detail_gain() const;
 
  private:
   FramePath(EngineKind kind, const AVFrame& first, const Source& source,
             const EngineOptions& options, Console& console);
 
+  EngineKind kind_;
   FrameSize size_;
   AVChromaLocation siting_;
+  bool is_picture_;
   Show show_;
   Console& console_;
   ToNv21 to_nv21_;
   std::unique_ptr<Engine> engine_;
   Nv21Frame nv21_;
+  std::optional<Nv21Frame> input_;
   bool change_noted_ = false;
 };
 

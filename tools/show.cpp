@@ -11,13 +11,21 @@ namespace {
 constexpr int kNoColor = 128;
 constexpr int kWhite = 255;
 
-// Even, so that it covers whole chroma samples.
-int divider_width(int width) { return 2 * (width / 640 + 1); }
+// The line between the halves, in luma samples. Both are even, so that it covers whole chroma
+// samples.
+struct Divider {
+  explicit Divider(int frame_width)
+      : width(std::min(2 * (frame_width / 640 + 1), frame_width / 2)),
+        begin((frame_width - width) / 4 * 2) {}
 
-void split_row(const uint8_t* before, uint8_t* row, size_t divider_begin, size_t divider_bytes,
-               int divider_value) {
-  std::memcpy(row, before, divider_begin);
-  std::memset(row + divider_begin, divider_value, divider_bytes);
+  int width;
+  int begin;
+};
+
+void split_row(const uint8_t* before, uint8_t* row, const Divider& divider, int divider_value) {
+  const size_t begin = static_cast<size_t>(divider.begin);
+  std::memcpy(row, before, begin);
+  std::memset(row + begin, divider_value, static_cast<size_t>(divider.width));
 }
 
 }  // namespace
@@ -40,13 +48,19 @@ void draw_map(const std::vector<float>& transmission, Nv21Frame& frame) {
 
 void draw_compare(const Nv21Frame& before, Nv21Frame& frame) {
   const size_t width = static_cast<size_t>(frame.width);
-  const int divider = std::min(divider_width(frame.width), frame.width / 2);
-  const int chroma_samples = (frame.width - divider) / 4;
-  const size_t begin = static_cast<size_t>(chroma_samples) * 2;
+  const Divider divider(frame.width);
   const size_t luma_rows = static_cast<size_t>(frame.height);
   for (size_t y = 0; y < luma_rows + luma_rows / 2; ++y) {
-    split_row(&before.bytes[y * width], &frame.bytes[y * width], begin,
-              static_cast<size_t>(divider), y < luma_rows ? kWhite : kNoColor);
+    split_row(&before.bytes[y * width], &frame.bytes[y * width], divider,
+              y < luma_rows ? kWhite : kNoColor);
+  }
+}
+
+void draw_compare_gain(std::vector<float>& gain, int frame_width) {
+  const Divider divider(frame_width);
+  for (auto row = gain.begin(); row != gain.end(); row += frame_width / 2) {
+    std::fill_n(row, divider.begin / 2, 1.0F);
+    std::fill_n(row + divider.begin / 2, divider.width / 2, 0.0F);
   }
 }
 

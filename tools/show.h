@@ -17,6 +17,10 @@ void draw_map(const std::vector<float>& transmission, Nv21Frame& frame);
 // `frame`.
 void draw_compare(const Nv21Frame& before, Nv21Frame& frame);
 
+// The same for what tells how many times stronger detail became in each 2 x 2 pixels: once as strong
+// in the left half, gone in the line.
+void draw_compare_gain(std::vector<float>& gain, int frame_width);
+
 // "light 200 203 208 strength 64": red, green, blue.
 std::string describe(const HazeFindings& findings);
 

@@ -37,9 +37,12 @@ class ToNv21 {
 
 // Pixel format and meaning of an output's samples.
 struct OutputSamples {
-  AVPixelFormat format;  // 8 bits; RGB or 4:2:0
+  AVPixelFormat format;  // 8 bits; RGB, 4:4:4 or 4:2:0
   SampleMeaning meaning;
 };
+
+// Marks a frame, whose samples it leaves as they are.
+void set_samples(AVFrame& frame, const OutputSamples& samples);
 
 // NV21 to frames of one output format, cropped to the visible size.
 class FromNv21 {

@@ -12,7 +12,7 @@ constexpr double kOwnShare = 0.05;
 
 // Of the picture, from its top down, and the share of a band's pixels that may be darker than what
 // counts as its darkest.
-constexpr int kBands = 16;
+constexpr size_t kBands = 16;
 constexpr double kDarkestPart = 0.01;
 // A band with a larger share of haze even there shows no ground, but sky or haze alone.
 constexpr double kGroundShare = 0.5;
@@ -24,10 +24,16 @@ constexpr double kJudgedBand = 0.65;
 // out. In between the part taken out grows evenly, since some of what looks like haze is the
 // things' own: with all of it taken out a thin veil would leave the picture farther from the truth
 // than it was.
-constexpr double kClearVeil = 0.04;
-constexpr double kFullVeil = 0.11;
+constexpr double kClearVeil = 0.03;
+constexpr double kFullVeil = 0.10;
 
-// Haze of a picture, as hazy() says: both measures have to find it.
+// The same veil as part of the mean share of haze over that ground. Haze lies over dark things as
+// over bright ones: up to the first value what looks like haze is bright grey things, asphalt, walls
+// or sand, and the map says too much; from the second on all of it is believed.
+constexpr double kNotConfirmed = 0.25;
+constexpr double kConfirmed = 0.55;
+
+// Haze of a picture, as hazy() says: all three measures have to find it.
 constexpr double kClear = 0.01;
 constexpr double kHazy = 0.08;
 
@@ -66,6 +72,7 @@ struct Scene {
   std::vector<float> share;  // of the haze
   std::vector<float> luma;
   std::array<std::vector<float>, kBands> by_pixel;  // shares by each pixel alone
+  std::array<double, kBands> band_sums = {};        // of the share
 };
 
 Scene without_bars(BgrImage& small, const GuidedModel& model, const Light& light,
@@ -80,25 +87,38 @@ Scene without_bars(BgrImage& small, const GuidedModel& model, const Light& light
       if (std::max({bgr[0], bgr[1], bgr[2]}) <= kBar) continue;
       scene.share.push_back(share.values[i]);
       scene.luma.push_back(static_cast<float>(luma(bgr[0], bgr[1], bgr[2])));
-      const int band = static_cast<int>(kBands * depth_in_view(x, y, small, orientation));
-      scene.by_pixel[static_cast<size_t>(std::min(band, kBands - 1))].push_back(by_pixel.values[i]);
+      const size_t band = std::min(
+          static_cast<size_t>(kBands * depth_in_view(x, y, small, orientation)), kBands - 1);
+      scene.by_pixel[band].push_back(by_pixel.values[i]);
+      scene.band_sums[band] += share.values[i];
     }
   }
   return scene;
 }
 
-// Share of haze that veils the darkest things on the ground. The ground comes nearer from band to
-// band, so that none has more haze than one above it: snow or sand in front, without anything dark,
-// does not count. A black thing in front hides the veil of its own bands and of those below only.
-double veil_over_ground(const Scene& scene) {
+// Shares of haze on the ground.
+struct Ground {
+  double veil;  // over the darkest things
+  double mean;  // over all things
+};
+
+// The ground comes nearer from band to band, so that none has more haze than one above it: snow or
+// sand in front, without anything dark, does not count as a veil. A black thing in front hides the
+// veil of its own bands and of those below only.
+Ground look_at_ground(const Scene& scene) {
   std::vector<float> veils;
   double veil = 1;
-  for (const std::vector<float>& band : scene.by_pixel) {
+  double means = 0;
+  for (size_t i = 0; i < kBands; ++i) {
+    const std::vector<float>& band = scene.by_pixel[i];
     if (band.empty()) continue;
     veil = std::min(veil, quantile(band, kDarkestPart));
-    if (veil < kGroundShare) veils.push_back(static_cast<float>(veil));
+    if (veil >= kGroundShare) continue;
+    veils.push_back(static_cast<float>(veil));
+    means += scene.band_sums[i] / static_cast<double>(band.size());
   }
-  return veils.empty() ? veil : quantile(veils, kJudgedBand);
+  if (veils.empty()) return {veil, veil};
+  return {quantile(veils, kJudgedBand), means / static_cast<double>(veils.size())};
 }
 
 // Haze over the nearest things, which a clear view shows without any, and half of that over the
@@ -137,12 +157,14 @@ HazeEvidence find_haze(BgrImage& small, const GuidedModel& model, const Light& l
   const Scene scene = without_bars(small, model, light, orientation);
   const double light_luma = luma(exact_light[0], exact_light[1], exact_light[2]);
   const double brightness = light_luma / 255;
-  const double veil = brightness * veil_over_ground(scene);
+  const Ground ground = look_at_ground(scene);
   HazeEvidence evidence;
   evidence.nearby = hazy(scene.share);
   evidence.amount =
       rise(brightness, kNoLight, kDaylight) *
-      std::min(rise(veil, kClearVeil, kFullVeil), rise(evidence.nearby, kClear, kHazy));
+      std::min({rise(brightness * ground.veil, kClearVeil, kFullVeil),
+                rise(ground.veil / std::max(ground.mean, 1e-6), kNotConfirmed, kConfirmed),
+                rise(evidence.nearby, kClear, kHazy)});
   evidence.largest_amount = std::min(largest_amount(scene, light_luma), 1.0);
   return evidence;
 }

@@ -8,7 +8,7 @@ namespace dehaze {
 namespace {
 
 // Hardly to be seen in a clear picture, and good for one with the thinnest haze.
-constexpr double kLeastAmount = 0.1;
+constexpr double kLeastAmount = 0.05;
 
 // The thicker the haze, the more has to be amplified to see through it; where there is little, what
 // looks like thick haze is bright sky.

@@ -9,7 +9,6 @@
 #include "errors.h"
 #include "frame_path.h"
 #include "interrupt.h"
-#include "media/color_convert.h"
 #include "media/reader.h"
 #include "progress.h"
 #include "report/gallery.h"
@@ -65,27 +64,26 @@ class Collector {
   Collector(const ReportOptions& options, const Reader& reader, const AVFrame& first,
             int64_t expected_frames, Console& console)
       : path_(first, source_of(reader, first), options.engine, console),
-        to_nv21_(path_.size(), reader.is_picture(), path_.siting()),
-        before_(path_.size().padded_width(), path_.size().padded_height()),
-        view_maker_(reader, first, path_.size(), path_.siting()),
+        view_maker_(reader, first),
         gallery_(expected_frames),
         timeline_(reader) {
+    path_.keep_input();
     if (!options.reference.empty())
       reference_ = std::make_unique<Reference>(options.reference, reader.is_picture());
   }
 
   void add(const AVFrame& frame) {
-    to_nv21_.convert(frame, before_);
     if (reference_) reference_->advance();
-    const Nv21Frame& after = path_.run(frame);
+    path_.run(frame);
     const double seconds = timeline_.seconds(frame, frames_);
     if (gallery_.wants(frames_)) {
-      View view = view_maker_.make(before_, after, path_.engine(), reference_.get());
+      View view = view_maker_.make(path_, frame, reference_.get());
       view.frame = frames_;
       view.seconds = seconds;
       gallery_.add(std::move(view));
     }
-    moments_.push_back({seconds, path_.engine().findings(), mean_luma(before_), mean_luma(after)});
+    moments_.push_back(
+        {seconds, path_.engine().findings(), mean_luma(path_.input()), mean_luma(path_.result())});
     ++frames_;
   }
 
@@ -100,8 +98,6 @@ class Collector {
 
  private:
   FramePath path_;
-  ToNv21 to_nv21_;  // the path hands out results only
-  Nv21Frame before_;
   ViewMaker view_maker_;
   Gallery gallery_;
   Timeline timeline_;

@@ -6,6 +6,7 @@
 #include "errors.h"
 #include "media/filter_pipe.h"
 #include "media/writer_picture.h"
+#include "picture_result.h"
 #include "show.h"
 
 namespace dehaze {
@@ -50,20 +51,15 @@ bool is_comparable(const RgbPicture& picture) {
 
 }  // namespace
 
-ViewMaker::ViewMaker(const Reader& reader, const AVFrame& first, const FrameSize& size,
-                     AVChromaLocation siting)
-    : size_(size),
-      is_picture_(reader.is_picture()),
+ViewMaker::ViewMaker(const Reader& reader, const AVFrame& first)
+    : is_picture_(reader.is_picture()),
       orientation_(orientation_of(reader.video(), first)),
       // What viewers do: they stretch video, but no pictures.
       pixel_aspect_(is_picture_ ? AVRational{0, 1}
                                 : turned(reader.sample_aspect_ratio(first), orientation_)),
-      to_rgb_(size.visible_width, size.visible_height, siting,
-              picture_samples(OutputKind::kPng, siting)),
       profile_(reference_to(first)) {}
 
-FramePtr ViewMaker::upright_rgb(const Nv21Frame& nv21) {
-  FramePtr rgb = to_rgb_.convert(nv21);
+FramePtr ViewMaker::upright(FramePtr rgb) const {
   return orientation_.is_upright() ? std::move(rgb) : run_filter(*rgb, orientation_.filter());
 }
 
@@ -71,20 +67,22 @@ Jpeg ViewMaker::jpeg(const AVFrame& rgb, size_t bytes) const {
   return jpeg_within(rgb, pixel_aspect_, {is_picture_ ? kPictureSide : kVideoSide, bytes});
 }
 
-View ViewMaker::make(const Nv21Frame& before, const Nv21Frame& after, const Engine& engine,
-                     const Reference* reference) {
+View ViewMaker::make(const FramePath& path, const AVFrame& source, const Reference* reference) {
+  const OutputSamples samples = picture_samples(OutputKind::kPng, path.siting());
+  const FrameSize& size = path.size();
   const size_t bytes = is_picture_ ? kPictureBytes : kVideoBytes;
   View view;
-  view.findings = engine.findings();
+  view.findings = path.engine().findings();
 
-  const std::vector<float> transmission = engine.transmission();
+  const std::vector<float> transmission = path.engine().transmission();
   view.mean_transmission = mean(transmission);
-  Nv21Frame map(after.width, after.height);
+  Nv21Frame map(size.padded_width(), size.padded_height());
   draw_map(transmission, map);
-  view.map = jpeg(*upright_rgb(map), bytes / kMapShare);
+  FromNv21 to_rgb(size.visible_width, size.visible_height, path.siting(), samples);
+  view.map = jpeg(*upright(to_rgb.convert(map)), bytes / kMapShare);
 
-  const FramePtr rgb_before = upright_rgb(before);
-  const FramePtr rgb_after = upright_rgb(after);
+  const FramePtr rgb_before = upright(before_in(path, source, samples));
+  const FramePtr rgb_after = upright(after_in(path, source, samples));
   const RgbPicture picture_before = picture_of(*rgb_before);
   const RgbPicture picture_after = picture_of(*rgb_after);
   view.tones_before = tones_of(picture_before);
@@ -97,8 +95,8 @@ View ViewMaker::make(const Nv21Frame& before, const Nv21Frame& after, const Engi
   if (reference == nullptr) return view;
   const bool transposed = orientation_.transposed;
   const FramePtr clear =
-      reference->rgb_like(*rgb_after, transposed ? size_.source_height : size_.source_width,
-                          transposed ? size_.source_width : size_.source_height);
+      reference->rgb_like(*rgb_after, transposed ? size.source_height : size.source_width,
+                          transposed ? size.source_width : size.source_height);
   view.clear = jpeg(*clear, bytes / 2);
   if (is_comparable(picture_after)) {
     const RgbPicture picture_clear = picture_of(*clear);

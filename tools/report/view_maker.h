@@ -3,8 +3,7 @@
 
 #include <string>
 
-#include "engine.h"
-#include "media/color_convert.h"
+#include "frame_path.h"
 #include "media/orientation.h"
 #include "report/data.h"
 #include "report/reference.h"
@@ -13,24 +12,21 @@ namespace dehaze {
 
 class ViewMaker {
  public:
-  // first: the frame that decided on `size`, `siting` and `orientation`.
-  ViewMaker(const Reader& reader, const AVFrame& first, const FrameSize& size,
-            AVChromaLocation siting);
+  // first: the frame that the path was made for.
+  ViewMaker(const Reader& reader, const AVFrame& first);
 
-  // before, after: of the padded size. reference: null if there is none.
-  View make(const Nv21Frame& before, const Nv21Frame& after, const Engine& engine,
-            const Reference* reference);
+  // source: the frame that the path ran last; the path keeps its input. reference: null if there is
+  // none.
+  View make(const FramePath& path, const AVFrame& source, const Reference* reference);
 
  private:
-  FramePtr upright_rgb(const Nv21Frame& nv21);
+  FramePtr upright(FramePtr rgb) const;
   Jpeg jpeg(const AVFrame& rgb, size_t bytes) const;
 
-  FrameSize size_;
   bool is_picture_;
   Orientation orientation_;
   AVRational pixel_aspect_;  // upright
-  FromNv21 to_rgb_;
-  FramePtr profile_;  // its side data may hold an ICC profile
+  FramePtr profile_;         // its side data may hold an ICC profile
 };
 
 }  // namespace dehaze
