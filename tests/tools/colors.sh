@@ -102,4 +102,21 @@ case_coarse_chroma_of_any_size() {
   done
 }
 
+case_palettes_and_few_bits() {
+  make_picture in.png 320x240
+  make_input -i in.png -filter_complex "split[a][b];[a]palettegen[p];[b][p]paletteuse" palette.png
+  equal "$(stream palette.png v pix_fmt)" pal8
+  dehaze --strength 0 palette.png out.png
+  same_picture out.png palette.png
+  # Full values stay full ones.
+  local format
+  for format in rgb565le rgb555le; do
+    make_input -f lavfi -i color=white:size=160x160 -frames:v 1 -c:v bmp -pix_fmt $format in.bmp
+    equal "$(stream in.bmp v pix_fmt)" $format
+    dehaze --force --strength 0 in.bmp out.png
+    equal "$(ffmpeg -nostdin -v error -i out.png -f rawvideo -pix_fmt rgb24 - | od -An -v -w1 -tu1 |
+      sort -u | tr -d ' ')" 255
+  done
+}
+
 run_case "$1"

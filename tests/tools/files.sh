@@ -153,7 +153,7 @@ case_killed() {
 
 case_full_disk_for_a_folder() {
   mkdir in disk
-  make_picture in/a.png 640x480
+  make_picture in/a.png 1280x960
   cp in/a.png in/b.png
   mount -t tmpfs -o size=64k none disk 2>/dev/null || skip "a small file system cannot be mounted"
   trap 'umount disk; rm -rf "$folder"' EXIT

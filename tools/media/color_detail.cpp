@@ -12,7 +12,8 @@ namespace dehaze {
 
 bool has_fine_color(AVPixelFormat pixel_format) {
   const AVPixFmtDescriptor& format = *av_pix_fmt_desc_get(pixel_format);
-  return format.nb_components >= 3 && format.log2_chroma_w + format.log2_chroma_h < 2;
+  const bool is_color = format.nb_components >= 3 || (format.flags & AV_PIX_FMT_FLAG_PAL) != 0;
+  return is_color && format.log2_chroma_w + format.log2_chroma_h < 2;
 }
 
 FramePtr in_samples(const AVFrame& picture, const OutputSamples& samples) {

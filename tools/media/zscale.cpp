@@ -89,7 +89,9 @@ FramePtr without_range(const AVFrame& frame) {
 std::string plain_format_filter(const AVFrame& frame) {
   const AVPixelFormat pixel_format = static_cast<AVPixelFormat>(frame.format);
   const AVPixFmtDescriptor& format = *av_pix_fmt_desc_get(pixel_format);
-  if (format.flags & AV_PIX_FMT_FLAG_PAL) return "format=gbrp";
+  const bool is_rgb = (format.flags & AV_PIX_FMT_FLAG_RGB) != 0;
+  const bool is_coarse = is_rgb && bits_per_sample(pixel_format) < 8;
+  if (is_coarse || (format.flags & AV_PIX_FMT_FLAG_PAL)) return "format=rgb24";
   if (format.flags & AV_PIX_FMT_FLAG_ALPHA) {
     return "format=" + opaque_format(format, bits_per_sample(pixel_format));
   }
@@ -100,8 +102,7 @@ std::string plain_format_filter(const AVFrame& frame) {
   const bool is_whole = is_multiple(frame.width, format.log2_chroma_w) &&
                         is_multiple(frame.height, format.log2_chroma_h);
   if (has_fixed_pixel_step(pixel_format) && is_whole) return "";
-  const bool is_rgb = (format.flags & AV_PIX_FMT_FLAG_RGB) != 0;
-  return is_rgb ? "format=gbrp" : "format=yuv422p|yuv420p|yuv444p";
+  return "format=yuv422p|yuv420p|yuv444p";
 }
 
 }  // namespace dehaze

@@ -24,7 +24,8 @@ FramePtr without_range(const AVFrame& frame);
 
 // Filter for frames that cannot be padded or scaled as they are (palettes, single bits, packed
 // 4:2:2, alpha channels, 4:1:1 and 4:1:0 of a size that is no multiple of 4), and for floating-point
-// grey, which the scaler in front of zscale would misread. Empty for all others.
+// grey, palettes and RGB of few bits, which the scaler in front of zscale would misread or get wrong
+// by several values. Empty for all others.
 std::string plain_format_filter(const AVFrame& frame);
 
 }  // namespace dehaze
