@@ -62,8 +62,8 @@ FramePath::FramePath(EngineKind kind, const AVFrame& first, const Source& source
       to_nv21_(size_, source.is_picture, siting_),
       engine_(
           make_engine(kind, options, size_.padded_width(), size_.padded_height(), source, console)),
-      nv21_(size_.padded_width(), size_.padded_height()) {
-  if (show_ == Show::kCompare) keep_input();
+      nv21_(size_.padded_width(), size_.padded_height()),
+      keeps_input_(show_ == Show::kCompare) {
   note_losses(first, size_, console);
 }
 
@@ -74,15 +74,11 @@ const Nv21Frame& FramePath::run(const AVFrame& frame) {
                   std::to_string(size_.visible_width) + " x " +
                   std::to_string(size_.visible_height));
   }
-  if (input_) input_->bytes = nv21_.bytes;
+  if (keeps_input_) input_ = nv21_;
   engine_->process(nv21_);
   if (show_ == Show::kMap) draw_map(engine_->transmission(), nv21_);
-  if (show_ == Show::kCompare) draw_compare(*input_, nv21_);
+  if (show_ == Show::kCompare) draw_compare(input_, nv21_);
   return nv21_;
-}
-
-void FramePath::keep_input() {
-  if (!input_) input_.emplace(nv21_.width, nv21_.height);
 }
 
 bool FramePath::has_detail() const {

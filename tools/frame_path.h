@@ -2,7 +2,6 @@
 #pragma once
 
 #include <memory>
-#include <optional>
 #include <vector>
 
 #include "console.h"
@@ -32,13 +31,13 @@ class FramePath {
   const Engine& engine() const { return *engine_; }
 
   // From the next frame on there is an input().
-  void keep_input();
+  void keep_input() { keeps_input_ = true; }
 
   // The result, or what is to be shown instead of it; valid until the next call.
   const Nv21Frame& run(const AVFrame& frame);
 
   // Of the last frame.
-  const Nv21Frame& input() const { return *input_; }
+  const Nv21Frame& input() const { return input_; }
   const Nv21Frame& result() const { return nv21_; }
 
   // True for pictures by the photo engine. What the preview engine makes is what a camera's screen
@@ -62,7 +61,8 @@ class FramePath {
   ToNv21 to_nv21_;
   std::unique_ptr<Engine> engine_;
   Nv21Frame nv21_;
-  std::optional<Nv21Frame> input_;
+  bool keeps_input_;
+  Nv21Frame input_ = {0, 0};
   bool change_noted_ = false;
 };
 

@@ -48,6 +48,7 @@ void add_color_detail(const AVFrame& fine, const AVFrame& coarse, const std::vec
         for (int c = 0; c < step; ++c, ++from, ++less, ++row) {
           const float sum =
               static_cast<float>(*row) + row_gain[x / 2] * static_cast<float>(*from - *less);
+          // NOLINTNEXTLINE(bugprone-incorrect-roundings): lround is a call for each sample
           *row = static_cast<uint8_t>(std::clamp(sum, 0.0F, 255.0F) + 0.5F);
         }
       }
